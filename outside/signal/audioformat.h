@@ -28,6 +28,19 @@ typedef struct _audio_format {
 
 typedef _audio_format AUDIO_FORMAT;
 
+/* Error codes of the signal library (AUDIOSIGNAL_GetLastError).  Several
+ * may be ORed when one call meets more than one problem. */
+#define AUDIO_ERROR_NONE               0x0000
+#define AUDIO_ERROR_READ               0x0001 /* the file could not be read */
+#define AUDIO_ERROR_FILE_NOT_FOUND     0x0002
+#define AUDIO_ERROR_WRITE              0x0004 /* the file could not be written */
+#define AUDIO_ERROR_ACCESS_DENIED      0x0008
+#define AUDIO_ERROR_BAD_ARGUMENT       0x0010 /* null handle, range or size out of bounds */
+#define AUDIO_ERROR_BAD_FORMAT_STRING  0x0020
+#define AUDIO_ERROR_UNSUPPORTED_FORMAT 0x0040 /* not an audio file we can read or write */
+#define AUDIO_ERROR_CORRUPT_DATA       0x0800 /* header or data do not make sense */
+#define AUDIO_ERROR_OUT_OF_MEMORY      0x1000
+
 #ifdef __cplusplus
 }
 #endif
