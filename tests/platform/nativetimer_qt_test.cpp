@@ -79,35 +79,75 @@ void CountWorkerTick(void *, uint32_t, uintptr_t, uint32_t)
     ++worker_ticks;
 }
 
+// A QThread running its event loop, and a way to run code inside it.
+class WorkerLoop {
+public:
+    WorkerLoop()
+    {
+        context_.moveToThread(&thread_);
+        thread_.start();
+    }
+    ~WorkerLoop() { Stop(); }
+
+    QThread *Thread() { return &thread_; }
+
+    // Creates a timer on the worker thread and returns its id.
+    uintptr_t StartTimer(VELMNATIVE_TimerProc proc)
+    {
+        uintptr_t id = 0;
+        Run([&] { id = VELMNATIVE_SetTimer(nullptr, 0, 10, proc); });
+        return id;
+    }
+    template <typename Function> void Post(Function function) { QMetaObject::invokeMethod(&context_, function); }
+    // Returns once the worker's loop has handled everything posted before.
+    template <typename Function> void Run(Function function)
+    {
+        QMetaObject::invokeMethod(&context_, function, Qt::BlockingQueuedConnection);
+    }
+    bool Stop()
+    {
+        thread_.quit();
+        return thread_.wait(kWatchdogMs);
+    }
+
+private:
+    QThread thread_;
+    QObject context_;
+};
+
 TEST_F(QtTimerDelivery, QThreadTicksOnItsOwnThread)
 {
     ticked_on = nullptr;
     worker_ticks = 0;
-    QThread worker;
-    QObject context;
-    context.moveToThread(&worker);
-    worker.start();
-    QMetaObject::invokeMethod(&context, [] { VELMNATIVE_SetTimer(nullptr, 0, 10, QuitWorkerOnTick); });
+    WorkerLoop worker;
+    worker.Post([] { VELMNATIVE_SetTimer(nullptr, 0, 10, QuitWorkerOnTick); });
 
-    ASSERT_TRUE(worker.wait(kWatchdogMs));
-    EXPECT_EQ(ticked_on.load(), &worker);
+    ASSERT_TRUE(worker.Thread()->wait(kWatchdogMs));
+    EXPECT_EQ(ticked_on.load(), worker.Thread());
     EXPECT_EQ(worker_ticks.load(), 1);
+}
+
+TEST_F(QtTimerDelivery, TimerOutlivingItsQThreadCanStillBeKilled)
+{
+    WorkerLoop worker;
+    uintptr_t id = worker.StartTimer(CountWorkerTick);
+    ASSERT_NE(id, 0u);
+    ASSERT_TRUE(worker.Stop());
+
+    EXPECT_EQ(VELMNATIVE_PumpTimers(), 0);
+    EXPECT_EQ(VELMNATIVE_KillTimer(nullptr, id), 1);
+    EXPECT_EQ(VELMNATIVE_KillTimer(nullptr, id), 0);
 }
 
 TEST_F(QtTimerDelivery, KillFromAnotherThreadStopsAQThreadTimer)
 {
     worker_ticks = 0;
-    QThread worker;
-    QObject context;
-    context.moveToThread(&worker);
-    worker.start();
-    uintptr_t id = 0;
-    QMetaObject::invokeMethod(&context, [&] { id = VELMNATIVE_SetTimer(nullptr, 0, 10, CountWorkerTick); },
-                              Qt::BlockingQueuedConnection);
+    WorkerLoop worker;
+    uintptr_t id = worker.StartTimer(CountWorkerTick);
     ASSERT_NE(id, 0u);
     std::promise<void> ticked;
     // Waits on the worker's loop until the first tick has been delivered.
-    QMetaObject::invokeMethod(&context, [&] {
+    worker.Post([&] {
         while (worker_ticks == 0)
             QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
         ticked.set_value();
@@ -116,10 +156,9 @@ TEST_F(QtTimerDelivery, KillFromAnotherThreadStopsAQThreadTimer)
 
     EXPECT_EQ(VELMNATIVE_KillTimer(nullptr, id), 1);
     const int ticks_at_kill = worker_ticks;
-    // Let the worker's loop run the posted stop, then end it.
-    QMetaObject::invokeMethod(&context, [] {}, Qt::BlockingQueuedConnection);
-    worker.quit();
-    ASSERT_TRUE(worker.wait(kWatchdogMs));
+    // The stop posted by the kill runs before this returns.
+    worker.Run([] {});
+    ASSERT_TRUE(worker.Stop());
     EXPECT_EQ(worker_ticks.load(), ticks_at_kill);
     EXPECT_EQ(VELMNATIVE_KillTimer(nullptr, id), 0);
 }
