@@ -104,18 +104,6 @@ TEST_F(VelmTimer, KillRefusesNullUnusedAndForeignHandles)
     EXPECT_EQ(probe.ticks, 0);
 }
 
-TEST_F(VelmTimer, ZeroIntervalTicksAtTheNativeMinimum)
-{
-    Probe probe;
-    ASSERT_NE(Create(0, &probe), nullptr);
-    clock.Advance(VELMNATIVE_TIMER_MINIMUM_MS - 1);
-    VELMNATIVE_PumpTimers();
-    EXPECT_EQ(probe.ticks, 0);
-    clock.Advance(1);
-    VELMNATIVE_PumpTimers();
-    EXPECT_EQ(probe.ticks, 1);
-}
-
 TEST_F(VelmTimer, NullCallbackTicksHarmlessly)
 {
     VELMTIMER timer = VELMTIMER_CreateTimer(10, nullptr, nullptr);
