@@ -15,6 +15,12 @@ namespace {
 
 int untitled_counter = 1;
 
+// The object registry disposes of documents still open at shut-down.
+int dispose_document(void *doc)
+{
+    return VELMAUDIO_Close(static_cast<VELMAUDIO>(doc));
+}
+
 VELMAUDIO create_record()
 {
     BLMEM pool = BLMEM_CreateMemDescrEx("VELMAUDIO Data Memory", 0, 8);
@@ -67,7 +73,7 @@ VELMAUDIO finish_new(VELMAUDIO doc, AUDIOSIGNAL *signal, bool from_signal)
     doc->fileStamp = 0;
     reset_view(doc);
     VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
-    RegisterObject(doc, 0, VELMAUDIO_Close);
+    RegisterObject(doc, 0, dispose_document);
     return doc;
 }
 
@@ -181,7 +187,7 @@ VELMAUDIO VELMAUDIO_CreateUnresolvedLink(void)
     if (!doc) return nullptr;
     doc->state->status |= STATUS_UNRESOLVED_LINK;
     VELMAUDIO_SetAudioSignal(doc, nullptr);
-    RegisterObject(doc, 0, VELMAUDIO_Close);
+    RegisterObject(doc, 0, dispose_document);
     return doc;
 }
 
@@ -398,7 +404,7 @@ int VELMAUDIO_HasActionInProgress(VELMAUDIO doc)
 
 int VELMAUDIO_IsOpen(VELMAUDIO doc)
 {
-    return doc && doc->signal ? 1 : 0;
+    return doc && doc->signal && !(doc->state->status & STATUS_NOT_LOADED) ? 1 : 0;
 }
 
 const char *VELMAUDIO_GetFileName(VELMAUDIO doc)

@@ -26,12 +26,12 @@ std::string normalised_word(const char *begin, const char *end)
 
 int VELMAUDIO_Editable(VELMAUDIO doc)
 {
-    return doc && (doc->options & OPTION_EDITABLE) ? 1 : 0;
+    return doc && doc->signal && (doc->options & OPTION_EDITABLE) ? 1 : 0;
 }
 
 int VELMAUDIO_SetEditable(VELMAUDIO doc, int editable)
 {
-    return set_flag(doc, OPTION_EDITABLE, editable != 0);
+    return doc && doc->signal ? set_flag(doc, OPTION_EDITABLE, editable != 0) : 0;
 }
 
 int VELMAUDIO_ShowInRecent(VELMAUDIO doc)

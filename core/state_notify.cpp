@@ -68,5 +68,6 @@ int64_t VELMSTATE_SelectionSize(VELMAUDIO doc, const VELMSTATE *state)
 
 int VELMAUDIO_HasChanges(VELMAUDIO doc)
 {
-    return doc && doc->state && (doc->state->status & STATUS_MODIFIED) ? 1 : 0;
+    if (!doc || !doc->state || !doc->signal) return 0;
+    return (doc->state->status & STATUS_MODIFIED) || AUDIOSIGNAL_HasChanges(doc->signal) ? 1 : 0;
 }

@@ -76,7 +76,7 @@ TEST_F(Doc, HandlersMayRewriteOrRefuseTheWindow)
     EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 10);
     EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 90);
     ASSERT_EQ(w.after.size(), 1u);
-    EXPECT_EQ(w.after[0], std::make_pair<int64_t, int64_t>(10, 90));
+    EXPECT_EQ(w.after[0], (std::pair<int64_t, int64_t>{10, 90}));
     VELMAUDIO_DelEventHandler(doc, WindowRewriter::handler, &w);
 
     uint32_t code = 0x20014;
