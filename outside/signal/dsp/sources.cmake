@@ -1,5 +1,5 @@
 # DSP routines: windows, power spectra, decibels, mel scale, splines, vectors.
-list(APPEND VELMSIGNAL_SOURCES
+set(VELMSIGNAL_DSP_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/fftlength.cpp
   ${CMAKE_CURRENT_LIST_DIR}/fftplans.cpp
   ${CMAKE_CURRENT_LIST_DIR}/fftproc.cpp
@@ -8,3 +8,9 @@ list(APPEND VELMSIGNAL_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/mels.cpp
   ${CMAKE_CURRENT_LIST_DIR}/spline.cpp
   ${CMAKE_CURRENT_LIST_DIR}/fvector.cpp)
+# The per-sample and per-bin loops are meant to run as vector code: let the
+# compiler weigh vectorising them fully, and let it evaluate comparisons
+# unconditionally (nothing here reads floating-point exception flags).
+set_source_files_properties(${VELMSIGNAL_DSP_SOURCES} PROPERTIES
+  COMPILE_OPTIONS "-fno-trapping-math;-fvect-cost-model=dynamic")
+list(APPEND VELMSIGNAL_SOURCES ${VELMSIGNAL_DSP_SOURCES})
