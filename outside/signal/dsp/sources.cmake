@@ -3,6 +3,7 @@ set(VELMSIGNAL_DSP_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/fftlength.cpp
   ${CMAKE_CURRENT_LIST_DIR}/fftplans.cpp
   ${CMAKE_CURRENT_LIST_DIR}/fftproc.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/dspinit.cpp
   ${CMAKE_CURRENT_LIST_DIR}/windows.cpp
   ${CMAKE_CURRENT_LIST_DIR}/decibels.cpp
   ${CMAKE_CURRENT_LIST_DIR}/mels.cpp
