@@ -223,6 +223,9 @@ BL_API int     MutexDestroy(BLMUTEX mutex);
 
 /* ---- Lists ------------------------------------------------------------ */
 
+/* An ordered list of non-null pointers, used by one thread at a time.
+ * DLList_Next answers null at the end; an iterator survives changes of its
+ * list (it walks by position). */
 typedef struct DLList DLList;
 typedef struct DLListIterator { const DLList *list; size_t index; } DLListIterator;
 
@@ -230,6 +233,7 @@ BL_API DLList *DLList_Create(void);
 BL_API int     DLList_Destroy(DLList *list);
 BL_API int     DLList_Append(DLList *list, void *item);
 BL_API int     DLList_Insert(DLList *list, size_t index, void *item);
+/* Removes the first occurrence. */
 BL_API int     DLList_Remove(DLList *list, void *item);
 BL_API size_t  DLList_Count(const DLList *list);
 BL_API void   *DLList_Get(const DLList *list, size_t index);
@@ -247,10 +251,20 @@ BL_API int     BLIO_GetHFileKind(const char *name);
  * nanoseconds since the epoch; 0 when the file is missing. */
 BL_API uint64_t BLUTIL_GetFileTime(const char *name, int kind);
 
-/* Text forms "[a,b,c]" and "[[a,b],[c,d]]" (row by row); -1 when the buffer is too small. */
+/* Times and stamps are nanoseconds since the epoch (UTC): the current time,
+ * and a time as a stamp.  Stamps keep the unit of times, so a stamp made from
+ * a file time equals that file time read again while the file is unchanged. */
+BL_API uint64_t BLgetgmtime(void);
+BL_API uint64_t BLtimeToBLtimeStamp(uint64_t time);
+
+/* Text forms "[a,b,c]" and "[[a,b],[c,d]]" (row by row), numbers in their
+ * shortest exact form whatever the locale.  Return the text's length, or -1
+ * when the buffer is too small (it then holds ""). */
 BL_API int BLSTRING_SetDoubleVectorToString(const double *values, int count, char *buffer, int size);
 BL_API int BLSTRING_SetDoubleMatrixToString(const double *values, int rows, int columns, char *buffer, int size);
-/* Parse the same forms; return the number of values read, -1 on malformed text. */
+/* Parse the same forms (spaces allowed); return the number of values read,
+ * -1 on malformed text, ragged rows or more values than capacity.  With null
+ * values they only count. */
 BL_API int BLSTRING_GetDoubleVectorFromString(const char *text, double *values, int capacity);
 BL_API int BLSTRING_GetDoubleMatrixFromString(const char *text, double *values, int capacity, int *rows, int *columns);
 

@@ -85,16 +85,18 @@ DSPB_API int DSPB_CreatePreEmphAdjust(float *weights, int fftLength, double coef
  * relative to full scale: a sine of amplitude 1 centred on a bin, analysed
  * through a window whose norm factor is `norm`, reads 0 dB (so does a
  * constant 1 in bin 0).  Each power is first multiplied by weights[k]
- * when weights is not null.  Results are clamped to -range .. 0.  in and
- * out may be the same array.  Returns the bin count, or 0 on bad arguments
- * (norm and range must be above 0). */
+ * when weights is not null.  Results are clamped to -range .. 0 (silence,
+ * NaN and negative powers read -range) and are within 1e-4 dB of
+ * 10 log10.  in and out may be the same array but must not otherwise
+ * overlap.  Returns the bin count, or 0 on bad arguments (norm and range
+ * must be finite and above 0). */
 DSPB_API int DSPB_PSDtoDB(int fftLength, const float *in, float *out, const float *weights,
                           double norm, double range);
 
 /* ---- Mel scale -------------------------------------------------------- */
 
 /* mel = 2595 log10(1 + f / 700), and its inverse; negative values mirror
- * positive ones so that every finite input has a finite answer. */
+ * positive ones, so no frequency gives NaN. */
 DSPB_API double DSPBUTIL_Freq2Mels(double frequency);
 DSPB_API double DSPBUTIL_Mels2Freq(double mels);
 

@@ -110,6 +110,35 @@ TEST(SignalDspSpectrum, DecibelsOfKnownPowers)
     EXPECT_EQ(again[4], -90.0f);
 }
 
+TEST(SignalDspSpectrum, DecibelsFollowTheLogarithmOverTheWholeRange)
+{
+    // Powers from far below the floor to far above full scale, in uneven steps.
+    const int n = 2048, bins = n / 2 + 1;
+    const double norm = 2.0, range = 300.0;  // inner bins: 0 dB at power 1
+    std::vector<float> in(bins), out(bins);
+    double p = 1e-35;
+    for (int round = 0; round < 40; ++round) {
+        for (auto &v : in) {
+            v = float(p);
+            p *= 1.00173;
+        }
+        ASSERT_EQ(DSPB_PSDtoDB(n, in.data(), out.data(), nullptr, norm, range), bins);
+        for (int k = 1; k < bins - 1; ++k) {
+            const double expected = std::clamp(10.0 * std::log10(double(in[k])), -range, 0.0);
+            ASSERT_NEAR(out[k], expected, 1e-4) << in[k];
+        }
+    }
+    // Nothing a power spectrum can hold escapes -range .. 0.
+    const float odd[] = {0.0f, -1.0f, NAN, INFINITY, 1e-44f /* subnormal */, -INFINITY};
+    for (float v : odd) {
+        std::fill(in.begin(), in.end(), v);
+        ASSERT_EQ(DSPB_PSDtoDB(n, in.data(), out.data(), nullptr, norm, range), bins);
+        const float expected = v == INFINITY ? 0.0f : float(-range);
+        for (float db : out)
+            ASSERT_EQ(db, expected) << v;
+    }
+}
+
 TEST(SignalDspSpectrum, DecibelsRefuseBadArguments)
 {
     float in[5] = {1, 1, 1, 1, 1}, out[5] = {7, 7, 7, 7, 7};
