@@ -9,6 +9,7 @@
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
 #include "edit/velmcustomtrack.h"
+#include "edit/velmundo.h"
 #include "outside/signal/audiosignal.h"
 
 namespace {
@@ -144,6 +145,7 @@ int close_document(VELMAUDIO doc)
     }
     if (doc->signal) AUDIOSIGNAL_Destroy(doc->signal);
     if (doc->state) VELMSTATE_Destroy(doc->state);
+    VELMUNDO_DestroyStack(doc);
     if (doc->settings) {
         if (doc->settingsActive) BLSETTINGS_Remove(doc->settings);
         BLSETTINGS_Destroy(doc->settings);
@@ -305,9 +307,8 @@ static int unload(VELMAUDIO doc)
 {
     VELMSTATE *state = doc->state;
     if (!(state->status & STATUS_HAS_FILE) || (state->status & STATUS_MODIFIED)) return 0;
-    if (doc->signal) {
-        AUDIOSIGNAL_Destroy(VELMAUDIO_SetAudioSignal(doc, nullptr));
-    }
+    if (doc->signal) AUDIOSIGNAL_Destroy(VELMAUDIO_SetAudioSignal(doc, nullptr));
+    VELMUNDO_DestroyStack(doc);
     if (doc->settings) {
         if (doc->settingsActive) BLSETTINGS_Remove(doc->settings);
         BLSETTINGS_Destroy(doc->settings);

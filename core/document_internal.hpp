@@ -16,7 +16,7 @@ struct _VELMAUDIO {
     BLMEM        pool;         // "VELMAUDIO Data Memory": the record lives here
     VELMSTATE   *state;
     AUDIOSIGNAL *signal;
-    void        *undo;         // undo stack, created on first use
+    struct VELMUNDOSTACK *undo; // undo stack, created on first use
     void        *renderer;     // created at the first draw
     void        *player;       // linked, not owned
     void        *recorder;     // linked, not owned
