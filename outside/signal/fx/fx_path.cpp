@@ -98,7 +98,9 @@ int64_t Path::estimate_output(int64_t frames) const
     const int64_t resamplers = std::count_if(stages_.begin(), stages_.end(), [](const auto &s) {
         return s->input().sampleRate != s->output().sampleRate;
     });
-    return scale_frames(frames, out.sampleRate, input_.sampleRate) + 1 + resamplers * kResamplerSlack;
+    const int64_t slack = 1 + resamplers * kResamplerSlack;
+    const int64_t scaled = scale_frames(frames, out.sampleRate, input_.sampleRate);
+    return scaled > INT64_MAX - slack ? INT64_MAX : scaled + slack;
 }
 
 void Path::run(std::span<const float> samples, size_t first)
@@ -126,8 +128,10 @@ int64_t Path::hand_out(float *out, int64_t room)
 int64_t Path::process(const float *in, int64_t frames, float *out, int64_t room)
 {
     const int64_t waiting = static_cast<int64_t>(pending_.size() - pending_start_) / output().numChannels;
-    if (in && waiting + estimate_output(frames) - room > kMaxPendingSamples / output().numChannels)
-        throw std::runtime_error("output would overflow the room given (" + std::to_string(room) + " frames)");
+    const __int128 kept = static_cast<__int128>(waiting) + estimate_output(frames) - room;
+    if (in && kept > kMaxPendingSamples / output().numChannels)
+        throw std::runtime_error("output kept back for want of room (" + std::to_string(room) +
+                                 " frames) would exceed " + std::to_string(kMaxPendingSamples) + " samples");
 
     int64_t written = hand_out(out, room);
     // Keep what is left at the front so that new output lands behind it.

@@ -131,7 +131,8 @@ TEST(ProcessSamples, RefusesToKeepBackUnboundedOutput)
     {
         LogCapture log;
         EXPECT_EQ(AUDIOFX_ProcessSamples(path, in.data(), 1100, nullptr, 0), -1);
-        EXPECT_EQ(log.errors().size(), 1u);
+        EXPECT_EQ(AUDIOFX_ProcessSamples(path, in.data(), INT64_MAX, nullptr, 0), -1);
+        EXPECT_EQ(log.errors().size(), 2u);
     }
     // Nothing was taken in: a short block with room still comes out whole.
     std::vector<float> out(64 * 20000);
