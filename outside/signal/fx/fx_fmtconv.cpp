@@ -56,8 +56,7 @@ public:
         output_.sampleRate = rate;
         output_.numChannels = static_cast<int16_t>(mix_.rows);
         if (rate != input.sampleRate) {
-            // Mix before resampling when that leaves fewer channels to resample.
-            const unsigned channels = std::min(mix_.rows, mix_.columns);
+            const unsigned channels = resampled_channels();
             soxr_error_t error = nullptr;
             const soxr_quality_spec_t quality = soxr_quality_spec(SOXR_HQ, 0);
             resampler_.reset(soxr_create(input.sampleRate, rate, channels, &error, nullptr, &quality, nullptr));
@@ -68,14 +67,12 @@ public:
 
     std::span<const float> process(std::span<const float> in) override
     {
-        const bool mix_first = mix_.rows <= mix_.columns;
         std::span<const float> data = in;
-        if (mixing_ && mix_first)
+        if (mixing_ && mix_first())
             data = mix(data);
         if (resampler_)
-            data = resample(data.data(), frames_of(data, mix_first ? mix_.rows : mix_.columns),
-                            mix_first ? mix_.rows : mix_.columns);
-        if (mixing_ && !mix_first)
+            data = resample(data.data(), static_cast<int64_t>(data.size()) / resampled_channels());
+        if (mixing_ && !mix_first())
             data = mix(data);
         return data;
     }
@@ -84,10 +81,9 @@ public:
     {
         if (!resampler_)
             return {};
-        const int channels = std::min(mix_.rows, mix_.columns);
-        std::span<const float> data = resample(nullptr, 0, channels);
+        std::span<const float> data = resample(nullptr, 0);
         soxr_clear(resampler_.get());
-        if (mixing_ && mix_.rows > mix_.columns)
+        if (mixing_ && !mix_first())
             data = mix(data);
         return data;
     }
@@ -97,22 +93,21 @@ public:
         const double ratio = static_cast<double>(output_.sampleRate) / input_.sampleRate;
         const auto out_frames = static_cast<size_t>(std::ceil(frames * ratio)) + kSlack;
         mixed_.reserve(std::max<size_t>(frames, out_frames) * std::max(mix_.rows, mix_.columns));
-        resampled_.reserve(out_frames * std::min(mix_.rows, mix_.columns));
+        resampled_.reserve(out_frames * resampled_channels());
     }
 
 private:
     static constexpr size_t kSlack = 1024;  // frames the resampler may give beyond the ratio
 
-    static int64_t frames_of(std::span<const float> data, int channels)
-    {
-        return static_cast<int64_t>(data.size()) / channels;
-    }
+    // Mixing comes before resampling when that leaves fewer channels to resample.
+    bool mix_first() const { return mix_.rows <= mix_.columns; }
+    int resampled_channels() const { return std::min(mix_.rows, mix_.columns); }
 
     std::span<const float> mix(std::span<const float> data)
     {
         std::vector<float> &out = mixed_;
         const int in = mix_.columns, outs = mix_.rows;
-        const int64_t frames = frames_of(data, in);
+        const int64_t frames = static_cast<int64_t>(data.size()) / in;
         out.resize(static_cast<size_t>(frames) * outs);
         const float *src = data.data();
         float *dst = out.data();
@@ -130,8 +125,9 @@ private:
 
     // Streams frames through the resampler (null in: end of input) and
     // returns all it gives back.
-    std::span<const float> resample(const float *in, int64_t frames, int channels)
+    std::span<const float> resample(const float *in, int64_t frames)
     {
+        const int channels = resampled_channels();
         const double ratio = static_cast<double>(output_.sampleRate) / input_.sampleRate;
         size_t capacity = static_cast<size_t>(std::ceil(frames * ratio)) + kSlack;
         size_t produced = 0;
