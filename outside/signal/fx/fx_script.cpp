@@ -1,5 +1,7 @@
 #include "outside/signal/fx/fx_script.hpp"
 
+#include "outside/base/blbase.h"
+
 #include <algorithm>
 #include <cctype>
 #include <charconv>
@@ -110,25 +112,35 @@ std::optional<double> parse_number(std::string_view text)
     return value;
 }
 
-// "[a,b,...]" with at least one number.
-std::optional<std::vector<double>> parse_vector(std::string_view text)
+bool all_finite(const std::vector<double> &values)
 {
-    text = trim(text);
-    if (text.size() < 2 || text.front() != '[' || text.back() != ']')
+    return std::all_of(values.begin(), values.end(), [](double v) { return std::isfinite(v); });
+}
+
+// "[a,b,...]" with at least one finite number.
+std::optional<std::vector<double>> parse_vector(const std::string &text)
+{
+    const int count = BLSTRING_GetDoubleVectorFromString(text.c_str(), nullptr, 0);
+    if (count <= 0)
         return std::nullopt;
-    std::vector<double> values;
-    std::string_view inside = text.substr(1, text.size() - 2);
-    size_t start = 0;
-    while (true) {
-        size_t comma = inside.find(',', start);
-        auto value = parse_number(inside.substr(start, comma == std::string_view::npos ? comma : comma - start));
-        if (!value)
-            return std::nullopt;
-        values.push_back(*value);
-        if (comma == std::string_view::npos)
-            return values;
-        start = comma + 1;
-    }
+    std::vector<double> values(static_cast<size_t>(count));
+    if (BLSTRING_GetDoubleVectorFromString(text.c_str(), values.data(), count) != count || !all_finite(values))
+        return std::nullopt;
+    return values;
+}
+
+// "[[a,b],[c,d]]" with at least one finite number.
+std::optional<Matrix> parse_matrix(const std::string &text)
+{
+    Matrix m;
+    const int count = BLSTRING_GetDoubleMatrixFromString(text.c_str(), nullptr, 0, &m.rows, &m.columns);
+    if (count <= 0)
+        return std::nullopt;
+    m.values.resize(static_cast<size_t>(count));
+    if (BLSTRING_GetDoubleMatrixFromString(text.c_str(), m.values.data(), count, &m.rows, &m.columns) != count ||
+        !all_finite(m.values))
+        return std::nullopt;
+    return m;
 }
 
 }  // namespace
@@ -224,20 +236,9 @@ std::optional<Matrix> StageParams::matrix(std::string_view key)
     const std::string *text = find(key);
     if (!text)
         return std::nullopt;
-    std::string_view all = trim(*text);
-    if (all.size() < 2 || all.front() != '[' || all.back() != ']')
-        fail(key, "is not a matrix \"[[a,b],[c,d]]\"");
-    Matrix m;
-    for (std::string_view row_text : split_outside_brackets(all.substr(1, all.size() - 2), ',', stage_.text)) {
-        auto row = parse_vector(row_text);
-        if (!row)
-            fail(key, "is not a matrix \"[[a,b],[c,d]]\"");
-        if (m.rows > 0 && row->size() != static_cast<size_t>(m.columns))
-            fail(key, "has rows of different lengths");
-        m.columns = static_cast<int>(row->size());
-        m.values.insert(m.values.end(), row->begin(), row->end());
-        ++m.rows;
-    }
+    auto m = parse_matrix(*text);
+    if (!m)
+        fail(key, "is not a matrix \"[[a,b],[c,d]]\" of numbers");
     return m;
 }
 

@@ -40,8 +40,9 @@ TEST(Gain, OffsetsFromTheMeansRemoveTheDC)
         in[i + 1] -= 0.125f;
     }
     // What a DC removal writes: the negated means in the vector text form.
-    char offsets[256];
-    std::snprintf(offsets, sizeof offsets, "[%.17g,%.17g]", -channel_mean(in, 2, 0), -channel_mean(in, 2, 1));
+    const double means[2] = {-channel_mean(in, 2, 0), -channel_mean(in, 2, 1)};
+    char offsets[1024];
+    ASSERT_GT(BLSTRING_SetDoubleVectorToString(means, 2, offsets, sizeof offsets), 0);
     AUDIOFX *path = AUDIOFX_CreatePathEx(format(44100, 2), -1, -1, "GAIN[offsets=%s]", offsets);
     ASSERT_NE(path, nullptr);
     const auto out = run_path(path, in, 2, {4410, 17});

@@ -141,6 +141,16 @@ TEST(Fmtconv, MixerGainsHaveOneRowPerOutputChannel)
         EXPECT_NEAR(out[i], expected[i], 1e-6) << i;
     AUDIOFX_DestroyPath(path);
 
+    // The text a format change writes for its mixer gains.
+    const double downmix[2 * 3] = {0.5, 0.25, 0.25, 0.0, 0.5, 0.5};
+    char gains[256];
+    ASSERT_GT(BLSTRING_SetDoubleMatrixToString(downmix, 2, 3, gains, sizeof gains), 0);
+    AUDIOFX *to_stereo = AUDIOFX_CreatePathEx(format(44100, 3), -1, -1, "fmtconv[sr=%d,nc=%d,mixergains=%s]",
+                                              48000, 2, gains);
+    ASSERT_NE(to_stereo, nullptr);
+    EXPECT_EQ(AUDIOFX_GetOutputFormat(to_stereo).numChannels, 2);
+    AUDIOFX_DestroyPath(to_stereo);
+
     // Without nc the rows give the channel count.
     AUDIOFX *swap = make(format(44100, 2), "fmtconv[mixergains=[[0,1],[1,0]]]");
     EXPECT_EQ(run_path(swap, {0.25f, 0.75f}, 2), (std::vector<float>{0.75f, 0.25f}));
