@@ -15,8 +15,8 @@ namespace {
 constexpr int kInRate = 44100;
 constexpr int kOutRate = 48000;
 constexpr int kChannels = 2;
-constexpr int64_t kBlock = 4096;   // frames per call
-constexpr int kMinutes = 10;       // streamed per run: one generated minute, repeated
+constexpr int64_t kBlock = 4096;  // frames per call
+constexpr int kMinutes = 10;      // streamed per run: one generated minute, repeated
 
 const std::vector<float> &one_minute()
 {
@@ -44,7 +44,8 @@ int64_t stream(Process process, Drain drain)
     int64_t produced = 0;
     for (int minute = 0; minute < kMinutes; ++minute)
         for (int64_t done = 0; done < frames; done += kBlock)
-            produced += process(in.data() + done * kChannels, std::min(kBlock, frames - done), out.data(), room);
+            produced +=
+                process(in.data() + done * kChannels, std::min(kBlock, frames - done), out.data(), room);
     for (int64_t got; (got = drain(out.data(), room)) > 0;)
         produced += got;
     benchmark::DoNotOptimize(out.data());
@@ -56,8 +57,9 @@ void report(benchmark::State &state, int64_t output_frames)
     const double seconds_of_audio = kMinutes * 60.0;
     state.SetItemsProcessed(static_cast<int64_t>(state.iterations()) * kMinutes * 60 * kInRate);
     // Time per iteration / (hours of audio per iteration).
-    state.counters["s_per_hour"] = benchmark::Counter(
-        seconds_of_audio / 3600.0, benchmark::Counter::kIsIterationInvariantRate | benchmark::Counter::kInvert);
+    state.counters["s_per_hour"] =
+        benchmark::Counter(seconds_of_audio / 3600.0,
+                           benchmark::Counter::kIsIterationInvariantRate | benchmark::Counter::kInvert);
     state.counters["out_frames"] = static_cast<double>(output_frames);
 }
 
@@ -70,7 +72,8 @@ void BM_SoxrDirect(benchmark::State &state)
         soxr_t resampler = soxr_create(kInRate, kOutRate, kChannels, nullptr, nullptr, &quality, nullptr);
         const auto run = [&](const float *in, int64_t frames, float *out, int64_t room) {
             size_t idone = 0, odone = 0;
-            soxr_process(resampler, in, static_cast<size_t>(frames), &idone, out, static_cast<size_t>(room), &odone);
+            soxr_process(resampler, in, static_cast<size_t>(frames), &idone, out, static_cast<size_t>(room),
+                         &odone);
             return static_cast<int64_t>(odone);
         };
         produced = stream(run, [&](float *out, int64_t room) { return run(nullptr, 0, out, room); });
@@ -89,9 +92,11 @@ void BM_EffectPath(benchmark::State &state)
     int64_t produced = 0;
     for (auto _ : state) {
         AUDIOFX *path = AUDIOFX_CreatePathEx(format, -1, kBlock, "fmtconv[sr=%d,nc=%d]", kOutRate, kChannels);
-        produced = stream([&](const float *in, int64_t frames, float *out,
-                              int64_t room) { return AUDIOFX_ProcessSamples(path, in, frames, out, room); },
-                          [&](float *out, int64_t room) { return AUDIOFX_ProcessSamples(path, nullptr, 0, out, room); });
+        produced = stream(
+            [&](const float *in, int64_t frames, float *out, int64_t room) {
+                return AUDIOFX_ProcessSamples(path, in, frames, out, room);
+            },
+            [&](float *out, int64_t room) { return AUDIOFX_ProcessSamples(path, nullptr, 0, out, room); });
         AUDIOFX_DestroyPath(path);
     }
     report(state, produced);

@@ -59,7 +59,8 @@ public:
             const unsigned channels = resampled_channels();
             soxr_error_t error = nullptr;
             const soxr_quality_spec_t quality = soxr_quality_spec(SOXR_HQ, 0);
-            resampler_.reset(soxr_create(input.sampleRate, rate, channels, &error, nullptr, &quality, nullptr));
+            resampler_.reset(
+                soxr_create(input.sampleRate, rate, channels, &error, nullptr, &quality, nullptr));
             if (!resampler_ || error)
                 throw ScriptError(std::string("resampler not created: ") + soxr_strerror(error));
         }
@@ -138,8 +139,8 @@ private:
             size_t idone = 0, odone = 0;
             const size_t room = capacity - produced;
             const soxr_error_t error = soxr_process(resampler_.get(), in ? in + consumed * channels : nullptr,
-                         static_cast<size_t>(frames - consumed), &idone,
-                         resampled_.data() + produced * channels, room, &odone);
+                                                    static_cast<size_t>(frames - consumed), &idone,
+                                                    resampled_.data() + produced * channels, room, &odone);
             if (error)
                 throw std::runtime_error(std::string("resampler failed: ") + error);
             consumed += static_cast<int64_t>(idone);
@@ -163,7 +164,8 @@ private:
 std::unique_ptr<Stage> build_fmtconv(StageParams &params, const StageContext &context)
 {
     const _audio_format &in = context.input;
-    const int rate = static_cast<int>(params.integer("sr", 1, AUDIOFX_MAX_SAMPLE_RATE).value_or(in.sampleRate));
+    const int rate =
+        static_cast<int>(params.integer("sr", 1, AUDIOFX_MAX_SAMPLE_RATE).value_or(in.sampleRate));
     if (rate > static_cast<int64_t>(in.sampleRate) * AUDIOFX_MAX_RATE_RATIO ||
         in.sampleRate > static_cast<int64_t>(rate) * AUDIOFX_MAX_RATE_RATIO)
         params.fail("sr", "differs from the input rate by more than a factor of " +
@@ -172,16 +174,18 @@ std::unique_ptr<Stage> build_fmtconv(StageParams &params, const StageContext &co
     auto gains = params.matrix("mixergains");
     if (gains) {
         if (gains->columns != in.numChannels || gains->rows > AUDIOFX_MAX_CHANNELS)
-            params.fail("mixergains", "is " + std::to_string(gains->rows) + "x" + std::to_string(gains->columns) +
-                                          " for " + std::to_string(in.numChannels) + " input channels");
+            params.fail("mixergains", "is " + std::to_string(gains->rows) + "x" +
+                                          std::to_string(gains->columns) + " for " +
+                                          std::to_string(in.numChannels) + " input channels");
         for (double g : gains->values)
             if (!std::isfinite(static_cast<float>(g)))
                 params.fail("mixergains", "holds a gain out of range");
         if (channels && *channels != gains->rows)
-            params.fail("mixergains", "has " + std::to_string(gains->rows) + " rows for nc=" +
-                                          std::to_string(*channels));
+            params.fail("mixergains",
+                        "has " + std::to_string(gains->rows) + " rows for nc=" + std::to_string(*channels));
     }
-    Matrix mix = gains ? std::move(*gains) : default_mix(in.numChannels, static_cast<int>(channels.value_or(in.numChannels)));
+    Matrix mix = gains ? std::move(*gains)
+                       : default_mix(in.numChannels, static_cast<int>(channels.value_or(in.numChannels)));
     return std::make_unique<FmtconvStage>(in, rate, std::move(mix));
 }
 

@@ -54,7 +54,8 @@ std::vector<std::unique_ptr<Stage>> Path::build(const std::vector<StageText> &te
 {
     std::vector<std::unique_ptr<Stage>> stages;
     for (size_t i = from; i < texts.size(); ++i) {
-        const StageContext context{format, length_ > 0 ? scale_frames(length_, format.sampleRate, input_.sampleRate) : -1};
+        const StageContext context{
+            format, length_ > 0 ? scale_frames(length_, format.sampleRate, input_.sampleRate) : -1};
         stages.push_back(build_stage(texts[i], context));
         format = stages.back()->output();
     }
@@ -67,7 +68,8 @@ void Path::reconfigure(std::string_view script)
     size_t kept = 0;
     while (kept < texts.size() && kept < texts_.size() && texts[kept].text == texts_[kept].text)
         ++kept;
-    std::vector<std::unique_ptr<Stage>> fresh = build(texts, kept, kept ? stages_[kept - 1]->output() : input_);
+    std::vector<std::unique_ptr<Stage>> fresh =
+        build(texts, kept, kept ? stages_[kept - 1]->output() : input_);
 
     const _audio_format before = output();
     stages_.resize(kept);
@@ -116,7 +118,8 @@ int64_t Path::hand_out(float *out, int64_t room)
     const int64_t waiting = static_cast<int64_t>(pending_.size() - pending_start_) / channels;
     const int64_t frames = std::min(waiting, room);
     if (frames > 0)
-        std::memcpy(out, pending_.data() + pending_start_, static_cast<size_t>(frames) * channels * sizeof(float));
+        std::memcpy(out, pending_.data() + pending_start_,
+                    static_cast<size_t>(frames) * channels * sizeof(float));
     pending_start_ += static_cast<size_t>(frames) * channels;
     if (pending_start_ == pending_.size()) {
         pending_.clear();

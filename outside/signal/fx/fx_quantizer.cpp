@@ -26,9 +26,7 @@ private:
 class QuantizerStage final : public FrameStage {
 public:
     QuantizerStage(const _audio_format &input, int bits, bool dither)
-        : FrameStage(input),
-          scale_(std::ldexp(1.0, bits - 1)),
-          dither_(dither)
+        : FrameStage(input), scale_(std::ldexp(1.0, bits - 1)), dither_(dither)
     {
         output_.bitsPerSample = static_cast<int16_t>(bits);
     }

@@ -85,8 +85,7 @@ StageText parse_stage(std::string_view text)
     for (std::string_view item : split_outside_brackets(inside, ',', stage.text)) {
         size_t eq = item.find('=');
         std::string key = lower(trim(item.substr(0, eq)));
-        if (eq == std::string_view::npos || key.empty() ||
-            !std::all_of(key.begin(), key.end(), is_name_char))
+        if (eq == std::string_view::npos || key.empty() || !std::all_of(key.begin(), key.end(), is_name_char))
             throw ScriptError("malformed key " + quoted(trim(item)) + " in " + quoted(stage.text));
         std::string_view value = trim(item.substr(eq + 1));
         if (value.empty())
@@ -124,7 +123,8 @@ std::optional<std::vector<double>> parse_vector(const std::string &text)
     if (count <= 0)
         return std::nullopt;
     std::vector<double> values(static_cast<size_t>(count));
-    if (BLSTRING_GetDoubleVectorFromString(text.c_str(), values.data(), count) != count || !all_finite(values))
+    if (BLSTRING_GetDoubleVectorFromString(text.c_str(), values.data(), count) != count ||
+        !all_finite(values))
         return std::nullopt;
     return values;
 }
@@ -137,7 +137,8 @@ std::optional<Matrix> parse_matrix(const std::string &text)
     if (count <= 0)
         return std::nullopt;
     m.values.resize(static_cast<size_t>(count));
-    if (BLSTRING_GetDoubleMatrixFromString(text.c_str(), m.values.data(), count, &m.rows, &m.columns) != count ||
+    if (BLSTRING_GetDoubleMatrixFromString(text.c_str(), m.values.data(), count, &m.rows, &m.columns) !=
+            count ||
         !all_finite(m.values))
         return std::nullopt;
     return m;
@@ -155,9 +156,7 @@ std::vector<StageText> split_script(std::string_view script)
     return stages;
 }
 
-StageParams::StageParams(const StageText &stage) : stage_(stage), used_(stage.params.size(), false)
-{
-}
+StageParams::StageParams(const StageText &stage) : stage_(stage), used_(stage.params.size(), false) {}
 
 const std::string *StageParams::find(std::string_view key)
 {
@@ -226,8 +225,8 @@ std::optional<std::vector<double>> StageParams::per_channel(std::string_view key
     if (values->size() == 1)
         values->assign(channels, values->front());
     else if (values->size() != static_cast<size_t>(channels))
-        fail(key, "has " + std::to_string(values->size()) + " values for " +
-                      std::to_string(channels) + " channels");
+        fail(key, "has " + std::to_string(values->size()) + " values for " + std::to_string(channels) +
+                      " channels");
     return values;
 }
 

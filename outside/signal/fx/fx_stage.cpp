@@ -30,9 +30,9 @@ std::unique_ptr<Stage> build_stage(const StageText &text, const StageContext &co
         std::string_view name;
         Builder build;
     } builders[] = {
-        {"fmtconv", build_fmtconv},     {"quantizer", build_quantizer}, {"gain", build_gain},
-        {"amplify", build_amplify},     {"invert", build_invert},       {"normalize", build_normalize},
-        {"fadein", build_fadein},       {"fadeout", build_fadeout},
+        {"fmtconv", build_fmtconv}, {"quantizer", build_quantizer}, {"gain", build_gain},
+        {"amplify", build_amplify}, {"invert", build_invert},       {"normalize", build_normalize},
+        {"fadein", build_fadein},   {"fadeout", build_fadeout},
     };
     for (const auto &entry : builders) {
         if (entry.name == text.name) {

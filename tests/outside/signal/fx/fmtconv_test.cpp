@@ -42,7 +42,8 @@ TEST(Fmtconv, LengthFollowsTheRateRatioAfterDrain)
     const struct {
         int from, to;
         int64_t frames;
-    } cases[] = {{44100, 48000, 3 * 44100 + 17}, {48000, 44100, 100003}, {8000, 44100, 8001}, {96000, 22050, 50000}};
+    } cases[] = {
+        {44100, 48000, 3 * 44100 + 17}, {48000, 44100, 100003}, {8000, 44100, 8001}, {96000, 22050, 50000}};
     for (const auto &c : cases) {
         AUDIOFX *path = AUDIOFX_CreatePathEx(format(c.from, 1), -1, -1, "fmtconv[sr=%d]", c.to);
         ASSERT_NE(path, nullptr);
@@ -56,7 +57,8 @@ TEST(Fmtconv, LengthFollowsTheRateRatioAfterDrain)
 TEST(Fmtconv, OddBlocksGiveTheSameOutputAsOneCall)
 {
     const auto in = sine(997, 44100, 2, 30011);
-    expect_block_size_does_not_matter(format(44100, 2), "fmtconv[sr=48000,nc=1]", in, {1, 7, 333, 4099, 64, 2});
+    expect_block_size_does_not_matter(format(44100, 2), "fmtconv[sr=48000,nc=1]", in,
+                                      {1, 7, 333, 4099, 64, 2});
     expect_block_size_does_not_matter(format(44100, 2), "fmtconv[sr=22050,nc=3]", in, {5000, 1, 13});
 }
 
@@ -145,8 +147,8 @@ TEST(Fmtconv, MixerGainsHaveOneRowPerOutputChannel)
     const double downmix[2 * 3] = {0.5, 0.25, 0.25, 0.0, 0.5, 0.5};
     char gains[256];
     ASSERT_GT(BLSTRING_SetDoubleMatrixToString(downmix, 2, 3, gains, sizeof gains), 0);
-    AUDIOFX *to_stereo = AUDIOFX_CreatePathEx(format(44100, 3), -1, -1, "fmtconv[sr=%d,nc=%d,mixergains=%s]",
-                                              48000, 2, gains);
+    AUDIOFX *to_stereo =
+        AUDIOFX_CreatePathEx(format(44100, 3), -1, -1, "fmtconv[sr=%d,nc=%d,mixergains=%s]", 48000, 2, gains);
     ASSERT_NE(to_stereo, nullptr);
     EXPECT_EQ(AUDIOFX_GetOutputFormat(to_stereo).numChannels, 2);
     AUDIOFX_DestroyPath(to_stereo);
@@ -167,4 +169,13 @@ TEST(Fmtconv, MixingAndResamplingTogetherKeepThePitch)
         EXPECT_NEAR(tone_level(out, channels, 0, 1000, 48000), expected, 0.005) << script;
         AUDIOFX_DestroyPath(path);
     }
+}
+
+TEST(Fmtconv, TheSameFormatPassesSamplesUnchanged)
+{
+    const auto in = sine(1000, 44100, 2, 3000);
+    AUDIOFX *path = make(format(44100, 2), "fmtconv[sr=44100,nc=2]");
+    EXPECT_EQ(run_path(path, in, 2, {1000, 7}), in);
+    EXPECT_EQ(AUDIOFX_MapOutputToInput(path, 777), 777);
+    AUDIOFX_DestroyPath(path);
 }

@@ -47,7 +47,8 @@ inline std::vector<float> run_path(AUDIOFX *path, const std::vector<float> &in, 
     size_t next = 0;
     for (int64_t done = 0; done < frames;) {
         const int64_t n = std::min(blocks[next++ % blocks.size()], frames - done);
-        const int64_t got = AUDIOFX_ProcessSamples(path, in.data() + done * in_channels, n, room.data(), room_frames);
+        const int64_t got =
+            AUDIOFX_ProcessSamples(path, in.data() + done * in_channels, n, room.data(), room_frames);
         EXPECT_GE(got, 0);
         out.insert(out.end(), room.begin(), room.begin() + got * out_channels);
         done += n;

@@ -6,18 +6,60 @@ using namespace fxtest;
 TEST(Script, MalformedTextsAreRefusedWithAMessage)
 {
     const char *bad[] = {
-        "", "   ", "nosuch", "nosuch[a=1]", "fmt-conv[sr=48000]", "fmtconv sr=48000", "fmtconv[sr=48000",
-        "fmtconv[sr=48000]]", "fmtconv[sr]", "fmtconv[=5]", "fmtconv[sr=]", "fmtconv[sr=48000,sr=44100]",
-        "fmtconv[rate=48000]", "fmtconv[sr=0]", "fmtconv[sr=-44100]", "fmtconv[sr=4.5e4]", "fmtconv[sr=abc]",
-        "fmtconv[sr=2000000]", "fmtconv[sr=100]", "fmtconv[nc=0]", "fmtconv[nc=-2]", "fmtconv[nc=65]",
-        "fmtconv[mixergains=[[1,0,0]]]", "fmtconv[mixergains=[[1],[0]]]", "fmtconv[nc=2,mixergains=[[1,0]]]",
-        "fmtconv[mixergains=[[1,0],[1]]]", "fmtconv[mixergains=[1,0]]", "fmtconv[mixergains=[[1,x]]]",
-        "fmtconv[mixergains=[[1e300,0]]]", "fmtconv[sr=48000]:", ":invert", "invert::invert", "invert[x=1]",
-        "quantizer", "quantizer[type=PCM12]", "quantizer[type=NOCHANGES ]", "quantizer[type=PCM16,dither=pink]",
-        "GAIN[offsets=[0.1,0.2,0.3]]", "GAIN[offsets=[0.1,x]]", "GAIN[offsets=[]]", "GAIN[offsets=[0.1,]]",
-        "GAIN[gains=[1],db=2]", "GAIN[db=nan]", "GAIN[db=inf]", "GAIN[db=1000]", "amplify", "amplify[db=1,factor=2]",
-        "normalize", "normalize[peak=-1]", "normalize[peak=1e-320]", "fadein", "fadein[length=0]",
-        "fadeout[length=-5]", "fadeout[length=1.5]",
+        "",
+        "   ",
+        "nosuch",
+        "nosuch[a=1]",
+        "fmt-conv[sr=48000]",
+        "fmtconv sr=48000",
+        "fmtconv[sr=48000",
+        "fmtconv[sr=48000]]",
+        "fmtconv[sr]",
+        "fmtconv[=5]",
+        "fmtconv[sr=]",
+        "fmtconv[sr=48000,sr=44100]",
+        "fmtconv[rate=48000]",
+        "fmtconv[sr=0]",
+        "fmtconv[sr=-44100]",
+        "fmtconv[sr=4.5e4]",
+        "fmtconv[sr=abc]",
+        "fmtconv[sr=2000000]",
+        "fmtconv[sr=100]",
+        "fmtconv[nc=0]",
+        "fmtconv[nc=-2]",
+        "fmtconv[nc=65]",
+        "fmtconv[mixergains=[[1,0,0]]]",
+        "fmtconv[mixergains=[[1],[0]]]",
+        "fmtconv[nc=2,mixergains=[[1,0]]]",
+        "fmtconv[mixergains=[[1,0],[1]]]",
+        "fmtconv[mixergains=[1,0]]",
+        "fmtconv[mixergains=[[1,x]]]",
+        "fmtconv[mixergains=[[1e300,0]]]",
+        "fmtconv[sr=48000]:",
+        ":invert",
+        "invert::invert",
+        "invert[x=1]",
+        "quantizer",
+        "quantizer[type=PCM12]",
+        "quantizer[type=NOCHANGES ]",
+        "quantizer[type=PCM16,dither=pink]",
+        "GAIN[offsets=[0.1,0.2,0.3]]",
+        "GAIN[offsets=[0.1,x]]",
+        "GAIN[offsets=[]]",
+        "GAIN[offsets=[0.1,]]",
+        "GAIN[gains=[1],db=2]",
+        "GAIN[db=nan]",
+        "GAIN[db=inf]",
+        "GAIN[db=1000]",
+        "amplify",
+        "amplify[db=1,factor=2]",
+        "normalize",
+        "normalize[peak=-1]",
+        "normalize[peak=1e-320]",
+        "fadein",
+        "fadein[length=0]",
+        "fadeout[length=-5]",
+        "fadeout[length=1.5]",
     };
     for (const char *script : bad) {
         LogCapture log;
@@ -92,7 +134,8 @@ TEST(Reconfigure, UnchangedLeadingStagesKeepTheirState)
     const int64_t p1 = AUDIOFX_ProcessSamples(path, in.data(), half, out.data(), 20000);
     ASSERT_EQ(r1, p1);
     ASSERT_EQ(AUDIOFX_ReconfigurePath(path, "fmtconv[sr=48000]:amplify[factor=2]"), 1);
-    const int64_t r2 = AUDIOFX_ProcessSamples(reference, in.data() + half, half, expected.data() + r1, 20000 - r1);
+    const int64_t r2 =
+        AUDIOFX_ProcessSamples(reference, in.data() + half, half, expected.data() + r1, 20000 - r1);
     const int64_t p2 = AUDIOFX_ProcessSamples(path, in.data() + half, half, out.data() + p1, 20000 - p1);
     ASSERT_EQ(r2, p2);
     ASSERT_GT(r2, 4000);
