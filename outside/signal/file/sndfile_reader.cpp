@@ -1,0 +1,165 @@
+#include "outside/signal/file/sndfile_reader_internal.hpp"
+
+#include <sndfile.h>
+
+#include <algorithm>
+#include <mutex>
+
+#include "outside/signal/file/formats_internal.hpp"
+#include "outside/signal/file/lasterror_internal.hpp"
+#include "outside/signal/file/metadata_internal.hpp"
+#include "outside/signal/file/sfmap_internal.hpp"
+#include "outside/signal/file/vfile_internal.hpp"
+
+namespace velmsig {
+
+namespace {
+
+// Compressed files cannot be checked against their size exactly; no coding
+// we read packs more frames than this into one byte.
+constexpr int64_t kMaxFramesPerByte = 8192;
+
+int error_of_sf(int sf_error, bool io_failed) {
+    if (io_failed) return AUDIO_ERROR_READ;
+    switch (sf_error) {
+        case SF_ERR_UNRECOGNISED_FORMAT: case SF_ERR_UNSUPPORTED_ENCODING: return AUDIO_ERROR_UNSUPPORTED_FORMAT;
+        case SF_ERR_SYSTEM: return AUDIO_ERROR_READ;
+        default: return AUDIO_ERROR_CORRUPT_DATA;
+    }
+}
+
+int bytes_per_sample(int coding) {
+    switch (coding) {
+        case AUDIO_FORMAT_PCM_16: return 2;
+        case AUDIO_FORMAT_PCM_24: return 3;
+        case AUDIO_FORMAT_PCM_32: case AUDIO_FORMAT_FLOAT: return 4;
+        case AUDIO_FORMAT_DOUBLE: return 8;
+        default: return 1;
+    }
+}
+
+// The SF_INFO that opens a headerless file as the format string says.
+bool raw_info(const ParsedFormat &f, SF_INFO *info) {
+    bool floating = f.coding == AUDIO_FORMAT_FLOAT;
+    int bits = f.bits ? f.bits : floating ? 32 : 16;
+    int coding = pcm_coding_for_bits(AUDIO_CONTAINER_RAW, bits, floating);
+    int sf = coding ? sf_format_of(AUDIO_CONTAINER_RAW, coding, bits) : 0;
+    if (!sf || f.sample_rate <= 0 || f.channels <= 0) return false;
+    *info = SF_INFO{};
+    info->samplerate = f.sample_rate;
+    info->channels = f.channels;
+    info->format = sf | (f.big_endian ? SF_ENDIAN_BIG : SF_ENDIAN_LITTLE);
+    return true;
+}
+
+class SndfileReader final : public FileReader {
+public:
+    SndfileReader(UniqueFd fd, int64_t size, int64_t base) : fd_(std::move(fd)), vfile_(fd_.get(), base, size, false) {}
+    ~SndfileReader() override {
+        if (sf_) sf_close(sf_);
+        AUDIOMETADATA_Destroy(meta_);
+    }
+
+    // Opens with `info` (zeroed for detection); returns an AUDIO_ERROR_* code.
+    int open(SF_INFO info, int64_t size) {
+        sf_ = sf_open_virtual(VirtualFile::io(), SFM_READ, &info, &vfile_);
+        if (!sf_) return error_of_sf(sf_error(nullptr), vfile_.failed());
+        if (info.channels < 1 || info.channels > AUDIO_MAX_CHANNELS || info.samplerate < 1 ||
+            info.samplerate > AUDIO_MAX_SAMPLE_RATE || info.frames < 0)
+            return AUDIO_ERROR_CORRUPT_DATA;
+        int container = container_of_sf(info.format), coding = coding_of_sf(info.format);
+        if (!container || !coding) return AUDIO_ERROR_UNSUPPORTED_FORMAT;
+        format_.sampleRate = info.samplerate;
+        format_.numChannels = static_cast<int16_t>(info.channels);
+        format_.bitsPerSample = static_cast<int16_t>(bits_of_sf(info.format));
+        format_.containerKind = static_cast<uint16_t>(container);
+        format_.audioFormatKind = static_cast<uint16_t>(coding);
+        random_ = coding_is_random_access(coding);
+        // Never trust the header's length beyond what the file can hold.
+        int64_t capacity = random_ ? size / (int64_t{bytes_per_sample(coding)} * info.channels)
+                                   : (size > INT64_MAX / kMaxFramesPerByte ? INT64_MAX : size * kMaxFramesPerByte);
+        frames_ = std::min<int64_t>(info.frames, capacity);
+        meta_ = metadata_from_sndfile(sf_);
+        return AUDIO_ERROR_NONE;
+    }
+
+    const _audio_format &format() const override { return format_; }
+    int64_t frames() const override { return frames_; }
+    bool random_access() const override { return random_; }
+    AUDIOMETADATA *metadata() override { return meta_; }
+    const char *format_name() const override { return format_name_for(format_.containerKind, format_.audioFormatKind); }
+
+    int64_t read(int64_t first, float *out, int64_t count) override {
+        if (!out || first < 0 || count < 0 || count > INT64_MAX / format_.numChannels) {
+            set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
+            return -1;
+        }
+        std::lock_guard lock(mutex_);
+        if (random_) {
+            if (first >= frames_) return 0;
+            count = std::min(count, frames_ - first);
+        }
+        if (count == 0) return 0;
+        if (first != next_) {
+            if (sf_seek(sf_, first, SEEK_SET) != first) {
+                // Past the real end of a compressed stream: nothing to read.
+                if (!random_ && sf_error(sf_) == SF_ERR_NO_ERROR && !vfile_.failed()) return 0;
+                set_last_error(AUDIO_ERROR_READ);
+                return -1;
+            }
+            next_ = first;
+        }
+        sf_count_t n = sf_readf_float(sf_, out, count);
+        if (n < 0 || vfile_.failed() || (n < count && sf_error(sf_) != SF_ERR_NO_ERROR)) {
+            next_ = -1;  // unknown: seek before the next read
+            set_last_error(vfile_.failed() ? AUDIO_ERROR_READ : AUDIO_ERROR_CORRUPT_DATA);
+            return -1;
+        }
+        next_ = first + n;
+        return n;
+    }
+
+private:
+    UniqueFd fd_;
+    VirtualFile vfile_;
+    SNDFILE *sf_ = nullptr;
+    _audio_format format_{};
+    int64_t frames_ = 0;
+    int64_t next_ = 0;  // the frame libsndfile reads next
+    bool random_ = false;
+    AUDIOMETADATA *meta_ = nullptr;
+    std::mutex mutex_;
+};
+
+}  // namespace
+
+std::unique_ptr<FileReader> open_sndfile_reader(UniqueFd fd, int64_t size, const ParsedFormat &format) {
+    SF_INFO info{};
+    bool raw = format.container == AUDIO_CONTAINER_RAW;
+    if (raw && !raw_info(format, &info)) {
+        set_last_error(AUDIO_ERROR_BAD_FORMAT_STRING);
+        return nullptr;
+    }
+    int64_t base = raw ? format.offset : 0;
+    int fd_number = fd.get();
+    auto reader = std::make_unique<SndfileReader>(std::move(fd), size, base);
+    int error = reader->open(info, size - std::min(size, base));
+    // "AUTO[sr=..,nc=..]": a file no header describes is read as headerless.
+    if (error == AUDIO_ERROR_UNSUPPORTED_FORMAT && format.container == 0 && format.sample_rate && format.channels &&
+        raw_info(format, &info)) {
+        UniqueFd again(dup(fd_number));
+        if (!again) {
+            set_last_error(AUDIO_ERROR_READ);
+            return nullptr;
+        }
+        reader = std::make_unique<SndfileReader>(std::move(again), size, format.offset);
+        error = reader->open(info, size - std::min(size, format.offset));
+    }
+    if (error != AUDIO_ERROR_NONE) {
+        set_last_error(error);
+        return nullptr;
+    }
+    return reader;
+}
+
+}  // namespace velmsig

@@ -1,0 +1,121 @@
+// Bad files fail to open with an error code; none crashes or makes the
+// reader allocate what the header claims.
+#include <gtest/gtest.h>
+#include <sndfile.h>
+
+#include <cstring>
+#include <random>
+
+#include "tests/outside/signal/file/file_helpers.hpp"
+
+using namespace velmsig;
+using namespace velmtest;
+
+namespace {
+
+// A canonical 44-byte WAVE header with the given fields.
+std::string wave_header(uint16_t channels, uint32_t rate, uint16_t bits, uint32_t data_bytes) {
+    std::string h;
+    auto u32 = [&h](uint32_t v) { for (int i = 0; i < 4; ++i) h += static_cast<char>(v >> (8 * i)); };
+    auto u16 = [&h](uint16_t v) { for (int i = 0; i < 2; ++i) h += static_cast<char>(v >> (8 * i)); };
+    h += "RIFF";
+    u32(36 + data_bytes);
+    h += "WAVEfmt ";
+    u32(16);
+    u16(1);
+    u16(channels);
+    u32(rate);
+    u32(rate * channels * bits / 8);
+    u16(static_cast<uint16_t>(channels * bits / 8));
+    u16(bits);
+    h += "data";
+    u32(data_bytes);
+    return h;
+}
+
+class Corrupt : public ::testing::Test {
+protected:
+    // Opening fails with `error`, through every way in.
+    void expect_refused(const std::string &bytes, int error) {
+        std::string path = dir_.file("bad.wav");
+        write_text(path, bytes);
+        AUDIOSIGNAL_ResetLastError();
+        EXPECT_EQ(open_reader(path.c_str(), "AUTO"), nullptr);
+        EXPECT_EQ(AUDIOSIGNAL_GetLastError(), error);
+        EXPECT_EQ(AUDIOSIGNAL_CanOpen(path.c_str(), "AUTO", AUDIO_CANOPEN_DECODE), 0);
+        EXPECT_EQ(AUDIOSIGNAL_GetLastError(), error);
+    }
+    TempDir dir_;
+};
+
+TEST_F(Corrupt, EmptyAndMissingFiles) {
+    expect_refused("", AUDIO_ERROR_CORRUPT_DATA);
+    EXPECT_EQ(open_reader(dir_.file("none.wav").c_str(), "AUTO"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_FILE_NOT_FOUND);
+    EXPECT_EQ(open_reader(dir_.path().c_str(), "AUTO"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_UNSUPPORTED_FORMAT);
+    EXPECT_EQ(open_reader(nullptr, "AUTO"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_BAD_ARGUMENT);
+}
+
+TEST_F(Corrupt, RandomBytesAreNotAudio) {
+    std::mt19937 random(7);
+    for (int round = 0; round < 20; ++round) {
+        std::string bytes(1 + random() % 5000, '\0');
+        for (char &b : bytes) b = static_cast<char>(random());
+        write_text(dir_.file("noise.bin"), bytes);
+        EXPECT_EQ(open_reader(dir_.file("noise.bin").c_str(), "AUTO"), nullptr);
+        EXPECT_NE(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_NONE);
+    }
+}
+
+TEST_F(Corrupt, HeadersClaimingTooMuch) {
+    std::string data(4000, '\x01');
+    expect_refused(wave_header(65535, 44100, 16, 4000) + data, AUDIO_ERROR_CORRUPT_DATA);
+    expect_refused(wave_header(100, 44100, 16, 4000) + data, AUDIO_ERROR_CORRUPT_DATA);
+    expect_refused(wave_header(2, 0, 16, 4000) + data, AUDIO_ERROR_CORRUPT_DATA);
+}
+
+TEST_F(Corrupt, TruncatedFilesOpenWithWhatTheyHold) {
+    auto samples = test_signal(2, 10000);
+    std::string path = dir_.file("t.wav");
+    ASSERT_TRUE(write_sndfile(path, SF_FORMAT_WAV | SF_FORMAT_PCM_16, 8000, 2, samples));
+    std::string whole = slurp(path);
+
+    // Cut inside the header: refused.
+    for (size_t cut : {4u, 12u, 30u})
+        expect_refused(whole.substr(0, cut), cut < 12 ? AUDIO_ERROR_UNSUPPORTED_FORMAT : AUDIO_ERROR_CORRUPT_DATA);
+
+    // Cut inside the samples: the frames that are there.
+    write_text(path, whole.substr(0, whole.size() - 4000));
+    auto reader = open_reader(path.c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr);
+    EXPECT_EQ(reader->frames(), 10000 - 1000);
+    auto got = read_all(*reader);
+    EXPECT_EQ(got, std::vector<float>(samples.begin(), samples.end() - 4000 / 2));
+
+    // A data size of 2^40 frames on a small file: bounded by the file.
+    write_text(path, wave_header(1, 8000, 16, 0xFFFFFFF0u) + std::string(2000, '\0'));
+    reader = open_reader(path.c_str(), "AUTO");
+    if (reader) {
+        EXPECT_LE(reader->frames(), 1000);
+        std::vector<float> out(4000);
+        EXPECT_LE(reader->read(0, out.data(), 4000), 1000);
+    } else {
+        EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_CORRUPT_DATA);
+    }
+}
+
+TEST_F(Corrupt, ReadArgumentsAreChecked) {
+    std::string path = dir_.file("ok.wav");
+    ASSERT_TRUE(write_sndfile(path, SF_FORMAT_WAV | SF_FORMAT_PCM_16, 8000, 2, test_signal(2, 100)));
+    auto reader = open_reader(path.c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr);
+    float out[8];
+    EXPECT_EQ(reader->read(-1, out, 1), -1);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_BAD_ARGUMENT);
+    EXPECT_EQ(reader->read(0, nullptr, 1), -1);
+    EXPECT_EQ(reader->read(0, out, INT64_MAX), -1);  // more samples than positions hold
+}
+
+}  // namespace

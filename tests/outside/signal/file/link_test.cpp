@@ -1,0 +1,93 @@
+// Link documents: opening one opens the audio it names.
+#include <gtest/gtest.h>
+#include <sndfile.h>
+
+#include "tests/outside/signal/file/file_helpers.hpp"
+
+using namespace velmsig;
+using namespace velmtest;
+
+namespace {
+
+class Link : public ::testing::Test {
+protected:
+    void SetUp() override {
+        samples_ = test_signal(2, 2000);
+        ASSERT_TRUE(write_sndfile(dir_.file("take.wav"), SF_FORMAT_WAV | SF_FORMAT_PCM_16, 48000, 2, samples_));
+    }
+    TempDir dir_;
+    std::vector<float> samples_;
+};
+
+TEST_F(Link, OpensTheNamedAudioRelativeToTheLinkFolder) {
+    write_text(dir_.file("take.velmlink"), "; a comment\n[velm.link]\nfile = take.wav\noptions=NOEDITABLE\n");
+    for (const char *text : {"AUTO", "LINK"}) {
+        auto reader = open_reader(dir_.file("take.velmlink").c_str(), text);
+        ASSERT_NE(reader, nullptr) << text << " " << AUDIOSIGNAL_GetLastError();
+        EXPECT_EQ(reader->format().containerKind, AUDIO_CONTAINER_LINK);
+        EXPECT_EQ(reader->format().audioFormatKind, AUDIO_FORMAT_PCM_16);
+        EXPECT_EQ(reader->format().sampleRate, 48000);
+        EXPECT_STREQ(reader->format_name(), "LINK");
+        EXPECT_TRUE(reader->random_access());
+        EXPECT_EQ(read_all(*reader), samples_);
+    }
+}
+
+TEST_F(Link, TakesWholeKeysAndAFormatString) {
+    ASSERT_TRUE(write_sndfile(dir_.file("take.pcm"), SF_FORMAT_RAW | SF_FORMAT_PCM_16, 8000, 2, samples_));
+    write_text(dir_.file("raw.ini"), "velm.link.file=" + dir_.file("take.pcm") +
+                                         "\nvelm.link.format=RAW[sr=8000,nc=2]\n");
+    auto reader = open_reader(dir_.file("raw.ini").c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr) << AUDIOSIGNAL_GetLastError();
+    EXPECT_EQ(reader->format().sampleRate, 8000);
+    EXPECT_EQ(read_all(*reader), samples_);
+}
+
+TEST_F(Link, RefusesLoopsMissingTargetsAndBadFormats) {
+    write_text(dir_.file("self.velmlink"), "[velm.link]\nfile=self.velmlink\n");
+    EXPECT_EQ(open_reader(dir_.file("self.velmlink").c_str(), "AUTO"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_CORRUPT_DATA);
+
+    write_text(dir_.file("a.velmlink"), "[velm.link]\nfile=b.velmlink\n");
+    write_text(dir_.file("b.velmlink"), "[velm.link]\nfile=./a.velmlink\n");
+    EXPECT_EQ(open_reader(dir_.file("a.velmlink").c_str(), "AUTO"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_CORRUPT_DATA);
+
+    write_text(dir_.file("gone.velmlink"), "[velm.link]\nfile=gone.wav\n");
+    EXPECT_EQ(open_reader(dir_.file("gone.velmlink").c_str(), "AUTO"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_FILE_NOT_FOUND);
+
+    write_text(dir_.file("nofile.velmlink"), "[velm.link]\noptions=EDITABLE\n");
+    EXPECT_EQ(open_reader(dir_.file("nofile.velmlink").c_str(), "LINK"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_CORRUPT_DATA);
+
+    write_text(dir_.file("badfmt.velmlink"), "[velm.link]\nfile=take.wav\nformat=WAVE[sr=oops]\n");
+    EXPECT_EQ(open_reader(dir_.file("badfmt.velmlink").c_str(), "AUTO"), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_BAD_FORMAT_STRING);
+
+    // Chains of links are followed, but not endlessly.
+    for (int i = 0; i < 12; ++i)
+        write_text(dir_.file("c" + std::to_string(i) + ".velmlink"),
+                   "[velm.link]\nfile=c" + std::to_string(i + 1) + ".velmlink\n");
+    write_text(dir_.file("c12.velmlink"), "[velm.link]\nfile=take.wav\n");
+    EXPECT_NE(open_reader(dir_.file("c6.velmlink").c_str(), "AUTO"), nullptr);
+    EXPECT_EQ(open_reader(dir_.file("c0.velmlink").c_str(), "AUTO"), nullptr);
+}
+
+TEST_F(Link, SavingThroughALinkWritesTheNamedAudio) {
+    std::string link_text = "[velm.link]\nfile=take.wav\n";
+    write_text(dir_.file("take.velmlink"), link_text);
+    auto louder = test_signal(2, 300);
+    _audio_format f = AUDIO_InitFormat(48000, 2, 16);
+    auto writer = create_writer(dir_.file("take.velmlink").c_str(), f, "LINK", nullptr);
+    ASSERT_NE(writer, nullptr) << AUDIOSIGNAL_GetLastError();
+    ASSERT_TRUE(writer->write(louder.data(), 300));
+    ASSERT_TRUE(writer->commit());
+    EXPECT_EQ(slurp(dir_.file("take.velmlink")), link_text);
+    auto reader = open_reader(dir_.file("take.wav").c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr);
+    EXPECT_STREQ(reader->format_name(), "WAVE");
+    EXPECT_EQ(read_all(*reader), louder);
+}
+
+}  // namespace
