@@ -6,6 +6,8 @@
  * Every call accepts null handles and answers with its failure value
  * (0, null or -1) instead of crashing.  Unless a call says otherwise, texts
  * handed in are copied and texts handed out stay owned by the library.
+ * printf-style formats also accept the 64-bit size prefix "I64" ("%I64d"),
+ * read as "ll".
  */
 #ifndef BLBASE_H
 #define BLBASE_H

@@ -107,24 +107,32 @@ SettingEntry &EntryFor(BLSettings &settings, const std::string &key)
     return entry;
 }
 
-int Change(BLSETTINGS handle, const std::string &text, bool secret)
+// Parses "key=value" and lets apply change the key's entry under the lock.
+template <typename Apply>
+int Assign(BLSETTINGS handle, const std::string &text, const char *caller, Apply apply)
 {
     std::string key, value;
     if (!SplitAssignment(text, key, value)) {
-        BLDEBUG_Warning(-1, "BLSETTINGS_ChangeEx: malformed setting \"%s\"", text.c_str());
+        BLDEBUG_Warning(-1, "%s: malformed setting \"%s\"", caller, text.c_str());
         return 0;
     }
     SettingsState &state = State();
     std::lock_guard guard(state.lock);
     BLSettings *settings = Resolve(state, handle);
-    if (!settings) return 0;
-    SettingEntry &entry = EntryFor(*settings, key);
-    if (entry.value == value && entry.secret == secret) return 0;
-    entry.value = std::move(value);
-    entry.secret = secret;
-    Touch(state, *settings);
-    WriteBack(*settings);
-    return 1;
+    return settings ? apply(state, *settings, EntryFor(*settings, key), std::move(value)) : 0;
+}
+
+int Change(BLSETTINGS handle, const std::string &text, bool secret)
+{
+    return Assign(handle, text, "BLSETTINGS_ChangeEx",
+                  [secret](SettingsState &state, BLSettings &settings, SettingEntry &entry, std::string value) {
+                      if (entry.value == value && entry.secret == secret) return 0;
+                      entry.value = std::move(value);
+                      entry.secret = secret;
+                      Touch(state, settings);
+                      WriteBack(settings);
+                      return 1;
+                  });
 }
 
 // The texts a read may answer with, best first: the value (with its secret
@@ -319,21 +327,14 @@ int BLSETTINGS_ChangeSecretEx(BLSETTINGS settings, const char *format, ...)
 int BLSETTINGS_SetDefaultEx(BLSETTINGS handle, const char *format, ...)
 {
     BL_FORMAT_OR_RETURN(text, format, 0);
-    std::string key, value;
-    if (!SplitAssignment(text, key, value)) {
-        BLDEBUG_Warning(-1, "BLSETTINGS_SetDefaultEx: malformed setting \"%s\"", text.c_str());
-        return 0;
-    }
-    SettingsState &state = State();
-    std::lock_guard guard(state.lock);
-    BLSettings *settings = Resolve(state, handle);
-    if (!settings) return 0;
-    SettingEntry &entry = EntryFor(*settings, key);
-    if (entry.default_value != value) {
-        entry.default_value = std::move(value);
-        Touch(state, *settings);
-    }
-    return 1;
+    return Assign(handle, text, "BLSETTINGS_SetDefaultEx",
+                  [](SettingsState &state, BLSettings &settings, SettingEntry &entry, std::string value) {
+                      if (entry.default_value != value) {
+                          entry.default_value = std::move(value);
+                          Touch(state, settings);
+                      }
+                      return 1;
+                  });
 }
 
 int BLSETTINGS_ExistsEx(BLSETTINGS handle, const char *format, ...)

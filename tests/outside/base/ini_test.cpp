@@ -43,6 +43,16 @@ protected:
         fs::permissions(folder, fs::perms::owner_all, fs::perm_options::add);
         fs::remove_all(folder);
     }
+    // A settings object bound to the file, which holds one value; before is its text.
+    BLSETTINGS BindWithOneValue(std::string &before)
+    {
+        BLSETTINGS s = BLSETTINGS_Create();
+        EXPECT_EQ(BLSETTINGS_SetConfigFileEx(s, path.c_str(), "ini"), 1);
+        BLSETTINGS_ChangeEx(s, "keep.me=1");
+        before = ReadAll(path);
+        EXPECT_NE(before.find("me=1"), std::string::npos);
+        return s;
+    }
     fs::path folder, path;
 };
 
@@ -151,10 +161,8 @@ TEST_F(IniFile, FoldersAndOversizedFilesAreRefused)
 // A write that fails leaves the old file whole.
 TEST_F(IniFile, FailedWriteInReadOnlyFolderKeepsTheOldFile)
 {
-    BLSETTINGS s = BLSETTINGS_Create();
-    ASSERT_EQ(BLSETTINGS_SetConfigFileEx(s, path.c_str(), "ini"), 1);
-    BLSETTINGS_ChangeEx(s, "keep.me=1");
-    const std::string before = ReadAll(path);
+    std::string before;
+    BLSETTINGS s = BindWithOneValue(before);
     fs::permissions(folder, fs::perms::owner_read | fs::perms::owner_exec);
     if (::access(folder.c_str(), W_OK) == 0) {
         BLSETTINGS_Destroy(s);
@@ -169,10 +177,8 @@ TEST_F(IniFile, FailedWriteInReadOnlyFolderKeepsTheOldFile)
 
 TEST_F(IniFile, FailedWriteOfAFullDiskKeepsTheOldFile)
 {
-    BLSETTINGS s = BLSETTINGS_Create();
-    ASSERT_EQ(BLSETTINGS_SetConfigFileEx(s, path.c_str(), "ini"), 1);
-    BLSETTINGS_ChangeEx(s, "keep.me=1");
-    const std::string before = ReadAll(path);
+    std::string before;
+    BLSETTINGS s = BindWithOneValue(before);
 
     // A file size limit makes every longer write fail, as a full disk would.
     struct rlimit old_limit;

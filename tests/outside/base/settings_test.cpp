@@ -160,12 +160,12 @@ TEST_F(Settings, SecretValuesReadPlainOnlyThroughTheSecretCall)
 TEST_F(Settings, MalformedTextsAndHandlesFail)
 {
     LogCapture log;
-    EXPECT_EQ(BLSETTINGS_ChangeEx(nullptr, "no equals sign"), 0);
-    EXPECT_EQ(BLSETTINGS_ChangeEx(nullptr, "=value"), 0);
-    EXPECT_EQ(BLSETTINGS_ChangeEx(nullptr, "bad[key]=1"), 0);
-    EXPECT_EQ(BLSETTINGS_ChangeEx(nullptr, "line\nbreak=1"), 0);
-    EXPECT_EQ(BLSETTINGS_ChangeEx(nullptr, "trailing.=1"), 0);
-    EXPECT_EQ(BLSETTINGS_SetDefaultEx(nullptr, "nothing"), 0);
+    const char *malformed[] = {"no equals sign", "=value", "bad[key]=1", "line\nbreak=1",
+                               "trailing.=1", ".leading=1", ";comment=1", "a. spaced=1"};
+    for (const char *text : malformed) {
+        EXPECT_EQ(BLSETTINGS_ChangeEx(nullptr, "%s", text), 0) << text;
+        EXPECT_EQ(BLSETTINGS_SetDefaultEx(nullptr, "%s", text), 0) << text;
+    }
     EXPECT_EQ(BLSETTINGS_ChangeEx(nullptr, nullptr), 0);
     EXPECT_EQ(BLSETTINGS_GetStringEx(nullptr, nullptr), nullptr);
     EXPECT_EQ(BLSETTINGS_GetStringEx(nullptr, "=[x]"), nullptr);
