@@ -19,14 +19,15 @@
 #include <stdint.h>
 
 #include "audioformat.h"
+#include "audiometadata.h"
 
 #ifdef __cplusplus
 extern "C" {
 #endif
 
-typedef struct AudioSignal AUDIOSIGNAL;
-typedef struct AudioBlocksList AUDIOBLOCKSLIST;
-typedef struct AudioSignalPipe AUDIOSIGNAL_PIPE;
+typedef struct _audio_signal AUDIOSIGNAL;
+typedef struct _audio_blocks_list AUDIOBLOCKSLIST;
+typedef struct _audio_signal_pipe AUDIOSIGNAL_PIPE;
 
 /* Channel masks are 32 bits wide: a signal has at most this many channels. */
 #define AUDIOSIGNAL_MAX_CHANNELS 32
@@ -71,8 +72,8 @@ AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_New(const AUDIO_FORMAT *format);
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_NewEx(const AUDIO_FORMAT *format);
 /* A signal of frames silent frames; silence takes no sample memory. */
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_CreateSilence(const AUDIO_FORMAT *format, int64_t frames);
-/* A copy sharing every block; format, masks, metadata, stamps and hash are
- * copied, the parent object is not.  flags are reserved (pass 0). */
+/* A copy sharing every block; format, masks, metadata, regions, stamps and
+ * hash are copied, the parent object is not.  flags are reserved (pass 0). */
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags);
 AUDIO_API int          AUDIOSIGNAL_Destroy(AUDIOSIGNAL *signal);
 
@@ -101,6 +102,11 @@ AUDIO_API int         AUDIOSIGNAL_GetFormatString(const AUDIOSIGNAL *signal, cha
 AUDIO_API const char *AUDIOSIGNAL_GetFileName(const AUDIOSIGNAL *signal);
 AUDIO_API int         AUDIOSIGNAL_ReadOnly(const AUDIOSIGNAL *signal);
 AUDIO_API int         AUDIOSIGNAL_SetReadOnly(AUDIOSIGNAL *signal, int read_only);
+/* The metadata object, owned by the signal, or null.  SetMetaData hands an
+ * object to the signal (which destroys the one it had); duplicates get a
+ * copy. */
+AUDIO_API AUDIOMETADATA *AUDIOSIGNAL_GetMetaData(const AUDIOSIGNAL *signal);
+AUDIO_API int            AUDIOSIGNAL_SetMetaData(AUDIOSIGNAL *signal, AUDIOMETADATA *metadata);
 
 /* Relabels the samples with a new rate (no conversion). */
 AUDIO_API int AUDIOSIGNAL_SetSampleRate(AUDIOSIGNAL *signal, int sample_rate);
@@ -264,7 +270,8 @@ AUDIO_API int AUDIOSIGNAL_GetStatisticsFromAcc(AUDIOSIGNAL_STATISTICS *out, AUDI
 /* ---- Edits ------------------------------------------------------------ */
 /* Edits act on the active channels.  Edits that change the length pad the
  * other channels with silence at their end so that every channel keeps one
- * length.  A failed edit leaves samples and stamps as they were. */
+ * length; regions move with the edited audio.  A failed edit leaves
+ * samples, regions and stamps as they were. */
 
 /* Copies begin..end into result (appending at its end) or into a new
  * signal when result is null.  Returns the result, null on failure. */
