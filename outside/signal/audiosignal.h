@@ -19,14 +19,15 @@
 #include <stdint.h>
 
 #include "audioformat.h"
+#include "audiometadata.h"
 
 #ifdef __cplusplus
 extern "C" {
 #endif
 
-typedef struct AudioSignal AUDIOSIGNAL;
-typedef struct AudioBlocksList AUDIOBLOCKSLIST;
-typedef struct AudioSignalPipe AUDIOSIGNAL_PIPE;
+typedef struct _audio_signal AUDIOSIGNAL;
+typedef struct _audio_blocks_list AUDIOBLOCKSLIST;
+typedef struct _audio_signal_pipe AUDIOSIGNAL_PIPE;
 
 /* Channel masks are 32 bits wide: a signal has at most this many channels. */
 #define AUDIOSIGNAL_MAX_CHANNELS 32
@@ -71,8 +72,8 @@ AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_New(const AUDIO_FORMAT *format);
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_NewEx(const AUDIO_FORMAT *format);
 /* A signal of frames silent frames; silence takes no sample memory. */
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_CreateSilence(const AUDIO_FORMAT *format, int64_t frames);
-/* A copy sharing every block; format, masks, metadata, stamps and hash are
- * copied, the parent object is not.  flags are reserved (pass 0). */
+/* A copy sharing every block; format, masks, metadata, regions, stamps and
+ * hash are copied, the parent object is not.  flags are reserved (pass 0). */
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags);
 AUDIO_API int          AUDIOSIGNAL_Destroy(AUDIOSIGNAL *signal);
 
@@ -101,6 +102,11 @@ AUDIO_API int         AUDIOSIGNAL_GetFormatString(const AUDIOSIGNAL *signal, cha
 AUDIO_API const char *AUDIOSIGNAL_GetFileName(const AUDIOSIGNAL *signal);
 AUDIO_API int         AUDIOSIGNAL_ReadOnly(const AUDIOSIGNAL *signal);
 AUDIO_API int         AUDIOSIGNAL_SetReadOnly(AUDIOSIGNAL *signal, int read_only);
+/* The metadata object, owned by the signal, or null.  SetMetaData hands an
+ * object to the signal (which destroys the one it had); duplicates get a
+ * copy. */
+AUDIO_API AUDIOMETADATA *AUDIOSIGNAL_GetMetaData(const AUDIOSIGNAL *signal);
+AUDIO_API int            AUDIOSIGNAL_SetMetaData(AUDIOSIGNAL *signal, AUDIOMETADATA *metadata);
 
 /* Relabels the samples with a new rate (no conversion). */
 AUDIO_API int AUDIOSIGNAL_SetSampleRate(AUDIOSIGNAL *signal, int sample_rate);
@@ -264,7 +270,8 @@ AUDIO_API int AUDIOSIGNAL_GetStatisticsFromAcc(AUDIOSIGNAL_STATISTICS *out, AUDI
 /* ---- Edits ------------------------------------------------------------ */
 /* Edits act on the active channels.  Edits that change the length pad the
  * other channels with silence at their end so that every channel keeps one
- * length.  A failed edit leaves samples and stamps as they were. */
+ * length; regions move with the edited audio.  A failed edit leaves
+ * samples, regions and stamps as they were. */
 
 /* Copies begin..end into result (appending at its end) or into a new
  * signal when result is null.  Returns the result, null on failure. */
@@ -287,6 +294,15 @@ AUDIO_API int AUDIOSIGNAL_MixPasteEx(AUDIOSIGNAL *signal, AUDIOSIGNAL *source, i
                                      int64_t begin, int64_t end, double gain, int64_t *length);
 AUDIO_API int AUDIOSIGNAL_SilenceEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t end);
 AUDIO_API int AUDIOSIGNAL_ReverseEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t end);
+/* Runs begin..end of the active channels through an effect script (see
+ * audiofx.h) that keeps the rate and channel count; the result replaces
+ * the range.  A bad script fails with nothing changed. */
+AUDIO_API int AUDIOSIGNAL_ApplyEffectEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t end,
+                                        const char *effect);
+/* A new signal: all of the signal through an effect script, which may
+ * change rate, channels and bits ("fmtconv[sr=48000,nc=1]"); metadata and
+ * regions come along.  Null for a bad script. */
+AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_ApplyTransform(AUDIOSIGNAL *signal, const char *effect);
 /* Returns the frames appended (frames, or -1 on failure). */
 AUDIO_API int64_t AUDIOSIGNAL_AppendSilence(AUDIOSIGNAL *signal, int64_t frames);
 /* Swaps the two channels of a stereo signal. */

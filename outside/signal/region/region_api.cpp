@@ -11,8 +11,6 @@ using velmsig::resolve;
 
 namespace {
 
-constexpr size_t kMaxText = 1u << 16;
-
 // The record a caller handed in, brought up to date after an edit.
 int refreshed(AUDIOREGION *record, const Region *live, int result)
 {
@@ -31,7 +29,7 @@ int set_flag(AUDIOREGION *record, uint32_t flag, bool on)
 int set_text(AUDIOREGION *record, std::optional<std::string> Region::*field, const char *text)
 {
     Region *r = resolve(record);
-    if (!r || (text && std::strlen(text) > kMaxText)) return 0;
+    if (!r || (text && std::strlen(text) > velmsig::RegionSet::kMaxText)) return 0;
     if (text)
         r->*field = text;
     else

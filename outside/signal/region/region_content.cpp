@@ -61,7 +61,8 @@ RegionFileContent RegionSet::export_content(int only_track) const
     return content;
 }
 
-int RegionSet::import_content(const RegionFileContent &content, int forced_track)
+int RegionSet::import_content(const RegionFileContent &content, int forced_track,
+                              std::vector<std::string> *problems)
 {
     // The file's track numbers become the document's through their names.
     std::unordered_map<int, int> numbers;
@@ -86,7 +87,10 @@ int RegionSet::import_content(const RegionFileContent &content, int forced_track
         Region *r = add(rec.begin, rec.begin + rec.length, track, rec.flags & kKeptFlags,
                         rec.label ? rec.label->c_str() : nullptr,
                         rec.comment ? rec.comment->c_str() : nullptr);
-        if (!r) continue;
+        if (!r) {
+            problems->push_back("region " + std::to_string(i + 1) + " cannot be added");
+            continue;
+        }
         // The length as written, not as recomputed from the end.
         if (r->begin == rec.begin && rec.length >= 0.0 && r->begin + rec.length <= duration())
             r->length = rec.length;

@@ -43,7 +43,7 @@ int read_region_file(RegionSet &set, const char *path, const char *format,
     if (error) return error;
     // Nothing usable at all is a broken file, not an empty one.
     if (content.regions.empty() && !content.problems.empty()) return AUDIO_ERROR_CORRUPT_DATA;
-    set.import_content(content, track);
+    set.import_content(content, track, problems);
     return AUDIO_ERROR_NONE;
 }
 

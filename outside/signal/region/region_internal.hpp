@@ -51,6 +51,8 @@ struct Region : AUDIOREGION {
 
 // The live region a record stands for, or null for null or zeroed records.
 Region *resolve(const AUDIOREGION *record);
+// Time order: begin, then length, then creation.
+bool region_before(const Region *a, const Region *b);
 
 // A region as region files carry it.
 struct RegionRecord {
@@ -106,8 +108,8 @@ public:
     int64_t to_sample(double seconds) const;
     double to_seconds(int64_t sample) const;
 
-    // New region, clamped to the signal; null when the set is full or the
-    // track is out of range.
+    // New region, clamped to the signal; null when the set is full, or for a
+    // track out of range, a time that is not a number or a text too long.
     Region *add(double begin, double end, int track, uint32_t flags,
                 const char *label, const char *comment);
     size_t size() const { return regions_.size(); }
@@ -126,13 +128,16 @@ public:
     // Region files.
     RegionFileContent export_content(int only_track) const;
     // Adds the content's regions; track names become numbers through the
-    // host.  Answers the number of regions added.
-    int import_content(const RegionFileContent &content, int forced_track);
+    // host.  Regions that cannot be added are noted in *problems.  Answers
+    // the number of regions added.
+    int import_content(const RegionFileContent &content, int forced_track,
+                       std::vector<std::string> *problems);
     int track_number(const std::string &name);   // -1 when unknown and nobody answers
     const std::map<int, std::string> &track_names() const { return track_names_; }
 
     static constexpr size_t kMaxRegions = 1u << 18;
     static constexpr int kMaxDepth = 32;        // nesting levels below a top region
+    static constexpr size_t kMaxText = 1u << 16;  // bytes of a label or comment
 
 private:
     RegionHost *host_;

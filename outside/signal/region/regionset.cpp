@@ -2,6 +2,7 @@
 // regions with the audio, nesting and the shares of children.
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 #include <limits>
 #include <unordered_map>
 #include <unordered_set>
@@ -15,13 +16,6 @@ namespace {
 constexpr uint32_t kTrackBits = AUDIOREGION_TRACK_MASK;
 
 double end_of(const Region *r) { return r->begin + r->length; }
-
-bool time_order(const Region *a, const Region *b)
-{
-    if (a->begin != b->begin) return a->begin < b->begin;
-    if (a->length != b->length) return a->length < b->length;
-    return a->serial < b->serial;
-}
 
 void update_share(Region *r)
 {
@@ -66,6 +60,13 @@ int height_of(const Region *r)
 
 }  // namespace
 
+bool region_before(const Region *a, const Region *b)
+{
+    if (a->begin != b->begin) return a->begin < b->begin;
+    if (a->length != b->length) return a->length < b->length;
+    return a->serial < b->serial;
+}
+
 Region *resolve(const AUDIOREGION *record)
 {
     if (!record || !record->identity) return nullptr;
@@ -106,7 +107,8 @@ Region *RegionSet::add(double begin, double end, int track, uint32_t flags, cons
                        const char *comment)
 {
     if (!std::isfinite(begin) || !std::isfinite(end) || track < 0 ||
-        track >= AUDIOREGION_MAX_TRACKS || regions_.size() >= kMaxRegions)
+        track >= AUDIOREGION_MAX_TRACKS || regions_.size() >= kMaxRegions ||
+        (label && std::strlen(label) > kMaxText) || (comment && std::strlen(comment) > kMaxText))
         return nullptr;
     if (end < begin) std::swap(begin, end);
     const double limit = duration();
@@ -143,7 +145,7 @@ std::vector<Region *> RegionSet::select(const RegionQuery &q) const
         if (q.filter && !q.filter(r)) continue;
         out.push_back(r);
     }
-    std::sort(out.begin(), out.end(), time_order);
+    std::sort(out.begin(), out.end(), region_before);
     return out;
 }
 

@@ -44,7 +44,7 @@ private:
     uint64_t a_ = 0x243F6A8885A308D3ull, b_ = 0x13198A2E03707344ull;
 };
 
-bool hash_samples(const AudioSignal &signal, AUDIOSIGNAL_HASH &out)
+bool hash_samples(const _audio_signal &signal, AUDIOSIGNAL_HASH &out)
 {
     Hasher hasher;
     hasher.add(uint32_t(signal.format.sampleRate));
@@ -68,7 +68,7 @@ extern "C" {
 AUDIOSIGNAL *AUDIOSIGNAL_New(const AUDIO_FORMAT *format)
 {
     if (!valid_format(format)) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return nullptr;
     }
     return create_signal(*format);
@@ -82,7 +82,7 @@ AUDIOSIGNAL *AUDIOSIGNAL_NewEx(const AUDIO_FORMAT *format)
 AUDIOSIGNAL *AUDIOSIGNAL_CreateSilence(const AUDIO_FORMAT *format, int64_t frames)
 {
     if (frames < 0) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return nullptr;
     }
     AUDIOSIGNAL *signal = AUDIOSIGNAL_New(format);
@@ -96,14 +96,14 @@ AUDIOSIGNAL *AUDIOSIGNAL_CreateSilence(const AUDIO_FORMAT *format, int64_t frame
 AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags)
 {
     if (!signal) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return nullptr;
     }
-    auto *copy = new AudioSignal;
+    auto *copy = new _audio_signal;
     std::lock_guard<std::mutex> guard(signal->lock);
     copy->format = signal->format;
     // Own sequences (sharing every chunk) so that each signal counts its share.
-    for (const AudioBlocksList *list : signal->lists) {
+    for (const _audio_blocks_list *list : signal->lists) {
         copy->lists.push_back(adopt_list(std::make_shared<const Segments>(list->segments->parts())));
     }
     copy->active_mask = signal->active_mask;
@@ -117,13 +117,14 @@ AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags)
     copy->file_name = signal->file_name;
     copy->format_text = signal->format_text;
     copy->file_size = signal->file_size;
+    copy->metadata = signal->metadata ? AUDIOMETADATA_Duplicate(signal->metadata) : nullptr;
+    if (signal->regions) signal_regions(copy)->copy_from(*signal->regions);
     return copy;
 }
 
 int AUDIOSIGNAL_Destroy(AUDIOSIGNAL *signal)
 {
     if (!signal) return 0;
-    for (AudioBlocksList *list : signal->lists) retire_list(list);
     delete signal;
     return 1;
 }
@@ -188,10 +189,23 @@ int AUDIOSIGNAL_SetReadOnly(AUDIOSIGNAL *signal, int read_only)
     return 1;
 }
 
+AUDIOMETADATA *AUDIOSIGNAL_GetMetaData(const AUDIOSIGNAL *signal)
+{
+    return signal ? signal->metadata : nullptr;
+}
+
+int AUDIOSIGNAL_SetMetaData(AUDIOSIGNAL *signal, AUDIOMETADATA *metadata)
+{
+    if (!signal) return 0;
+    if (signal->metadata != metadata) AUDIOMETADATA_Destroy(signal->metadata);
+    signal->metadata = metadata;
+    return 1;
+}
+
 int AUDIOSIGNAL_SetSampleRate(AUDIOSIGNAL *signal, int sample_rate)
 {
     if (!signal || sample_rate <= 0) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     std::unique_lock<std::shared_mutex> writer(signal->access);
@@ -260,7 +274,7 @@ AUDIOSIGNAL_HASH *AUDIOSIGNAL_GetSignalHash(AUDIOSIGNAL_HASH *out, AUDIOSIGNAL *
     const uint64_t stamp = AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_CHANGES);
     AUDIOSIGNAL_HASH hash;
     if (!hash_samples(*signal, hash)) {
-        set_error(AUDIO_ERROR_READ);
+        set_last_error(AUDIO_ERROR_READ);
         return nullptr;
     }
     std::lock_guard<std::mutex> guard(signal->lock);
@@ -273,9 +287,9 @@ AUDIOSIGNAL_HASH *AUDIOSIGNAL_GetSignalHash(AUDIOSIGNAL_HASH *out, AUDIOSIGNAL *
 int64_t AUDIOSIGNAL_SizeInMemory(const AUDIOSIGNAL *signal)
 {
     if (!signal) return 0;
-    int64_t bytes = int64_t(sizeof(AudioSignal));
+    int64_t bytes = int64_t(sizeof(_audio_signal));
     std::lock_guard<std::mutex> guard(signal->lock);
-    for (const AudioBlocksList *list : signal->lists) bytes += list_memory_share(*list);
+    for (const _audio_blocks_list *list : signal->lists) bytes += list_memory_share(*list);
     return bytes;
 }
 

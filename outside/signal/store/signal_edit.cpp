@@ -15,7 +15,7 @@ namespace {
 // leaves the signal untouched.
 class Edit {
 public:
-    explicit Edit(AudioSignal &signal)
+    explicit Edit(_audio_signal &signal)
         : signal_(signal), writer_(signal.access), current_(all_segments(signal)), next_(current_.size()),
           mask_(AUDIOSIGNAL_GetActiveChannelMask(&signal))
     {
@@ -27,6 +27,9 @@ public:
     int active_count() const { return __builtin_popcount(mask_); }
     const Segments &current(int channel) const { return *current_[size_t(channel)]; }
     void set(int channel, SegmentsPtr segments) { next_[size_t(channel)] = std::move(segments); }
+    // Timeline moves the regions follow once the edit is in place.
+    void removed(int64_t at, int64_t frames) { moves_.push_back({at, -frames}); }
+    void inserted(int64_t at, int64_t frames) { moves_.push_back({at, frames}); }
 
     // Pads every channel shorter than the longest with silence at its end,
     // then installs the new lists and moves the change stamp.
@@ -42,16 +45,22 @@ public:
             next_[c] = builder.build();
         }
         install_segments(signal_, next_);
+        if (!signal_.regions) return;
+        for (const auto &[at, frames] : moves_) {
+            if (frames < 0) signal_.regions->on_remove(at, -frames);
+            if (frames > 0) signal_.regions->on_insert(at, frames);
+        }
     }
 
 private:
     const Segments &result(size_t c) const { return next_[c] ? *next_[c] : *current_[c]; }
 
-    AudioSignal &signal_;
+    _audio_signal &signal_;
     std::unique_lock<std::shared_mutex> writer_;
     std::vector<SegmentsPtr> current_;
     std::vector<SegmentsPtr> next_;
     uint32_t mask_;
+    std::vector<std::pair<int64_t, int64_t>> moves_;
 };
 
 // [0, begin) + middle + [end, length) of one channel.
@@ -81,7 +90,7 @@ bool append_made(SegmentsBuilder &builder, int64_t count, Make make)
 
 bool bad_argument()
 {
-    set_error(AUDIO_ERROR_BAD_ARGUMENT);
+    set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
     return false;
 }
 
@@ -91,7 +100,7 @@ int source_channel(int active_index, int source_channels)
     return active_index % source_channels;
 }
 
-bool paste(AudioSignal &signal, const AudioSignal &source, int64_t begin, int64_t end, int64_t *length)
+bool paste(_audio_signal &signal, const _audio_signal &source, int64_t begin, int64_t end, int64_t *length)
 {
     const std::vector<SegmentsPtr> pasted = all_segments(source);
     Edit edit(signal);
@@ -106,19 +115,21 @@ bool paste(AudioSignal &signal, const AudioSignal &source, int64_t begin, int64_
                      return true;
                  }));
     }
+    edit.removed(begin, end - begin);
+    edit.inserted(begin, pasted[0]->length());
     edit.commit();
     if (length) *length = pasted[0]->length();
     return true;
 }
 
 // A new signal of the channels in mask over [begin, end) (clamped).
-AudioSignal *copy_range(AudioSignal &signal, uint32_t mask, int64_t begin, int64_t end)
+_audio_signal *copy_range(_audio_signal &signal, uint32_t mask, int64_t begin, int64_t end)
 {
     const std::vector<SegmentsPtr> segments = all_segments(signal);
     AUDIO_FORMAT format;
     AUDIOSIGNAL_GetFormat(&signal, &format);
     format.numChannels = int16_t(__builtin_popcount(mask & all_channels_mask(format.numChannels)));
-    AudioSignal *copy = create_signal(format);
+    _audio_signal *copy = create_signal(format);
     if (!copy) return nullptr;
     clamp_range(segments[0]->length(), begin, end);
     std::vector<SegmentsPtr> parts;
@@ -134,7 +145,7 @@ AudioSignal *copy_range(AudioSignal &signal, uint32_t mask, int64_t begin, int64
 
 // Puts a finished piece into result: it becomes the result when result is
 // null, else it is pasted at result's end and dropped.
-AUDIOSIGNAL *deliver(AudioSignal *piece, AUDIOSIGNAL *result)
+AUDIOSIGNAL *deliver(_audio_signal *piece, AUDIOSIGNAL *result)
 {
     if (!piece || !result) return piece;
     const bool ok = paste(*result, *piece, AUDIOSIGNAL_END, AUDIOSIGNAL_END, nullptr);
@@ -142,7 +153,7 @@ AUDIOSIGNAL *deliver(AudioSignal *piece, AUDIOSIGNAL *result)
     return ok ? result : nullptr;
 }
 
-uint32_t copy_mask(AudioSignal &signal, int flags)
+uint32_t copy_mask(_audio_signal &signal, int flags)
 {
     const bool all = (flags & AUDIOSIGNAL_COPY_OPTION) && (flags & AUDIOSIGNAL_COPY_ALLCHANNELS);
     return all ? all_channels_mask(signal.format.numChannels) : AUDIOSIGNAL_GetActiveChannelMask(&signal);
@@ -182,6 +193,7 @@ int AUDIOSIGNAL_ClearEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t e
         if (!edit.active(c)) continue;
         edit.set(c, splice(edit.current(c), begin, end, [](SegmentsBuilder &) { return true; }));
     }
+    edit.removed(begin, end - begin);
     edit.commit();
     return 1;
 }
@@ -221,7 +233,7 @@ int AUDIOSIGNAL_MixPasteEx(AUDIOSIGNAL *signal, AUDIOSIGNAL *source, int flags, 
             });
         });
         if (!result) {
-            set_error(AUDIO_ERROR_READ);
+            set_last_error(AUDIO_ERROR_READ);
             return 0;
         }
         edit.set(c, result);
@@ -263,7 +275,7 @@ int AUDIOSIGNAL_ReverseEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t
             });
         });
         if (!result) {
-            set_error(AUDIO_ERROR_READ);
+            set_last_error(AUDIO_ERROR_READ);
             return 0;
         }
         edit.set(c, result);
@@ -319,7 +331,7 @@ AUDIOSIGNAL *AUDIOSIGNAL_CombineToStereoEx(AUDIOSIGNAL *left, AUDIOSIGNAL *right
     AUDIO_FORMAT format;
     AUDIOSIGNAL_GetFormat(left, &format);
     format.numChannels = 2;
-    AudioSignal *stereo = create_signal(format);
+    _audio_signal *stereo = create_signal(format);
     const SegmentsPtr l = channel_segments(*left, 0), r = channel_segments(*right, 0);
     const int64_t longest = std::max(l->length(), r->length());
     std::vector<SegmentsPtr> parts;

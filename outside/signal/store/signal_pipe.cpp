@@ -8,8 +8,8 @@ using namespace velmsig;
 
 // The frames since the last full chunk stay in the pipe: each append makes
 // one new chunk of them, so the signal holds full chunks plus one short one.
-struct AudioSignalPipe {
-    AudioSignal *signal;
+struct _audio_signal_pipe {
+    _audio_signal *signal;
     int64_t position;                       // where the next frame goes
     std::vector<std::vector<float>> open;   // per channel: frames of the short chunk
 };
@@ -19,10 +19,10 @@ extern "C" {
 AUDIOSIGNAL_PIPE *AUDIOSIGNAL_CreatePipe(AUDIOSIGNAL *signal, int64_t position)
 {
     if (!signal) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return nullptr;
     }
-    auto *pipe = new AudioSignalPipe;
+    auto *pipe = new _audio_signal_pipe;
     pipe->signal = signal;
     pipe->position = std::clamp<int64_t>(position, 0, signal_length(*signal));
     pipe->open.resize(size_t(signal->format.numChannels));
@@ -32,11 +32,11 @@ AUDIOSIGNAL_PIPE *AUDIOSIGNAL_CreatePipe(AUDIOSIGNAL *signal, int64_t position)
 int64_t AUDIOSIGNAL_AppendToPipe(AUDIOSIGNAL_PIPE *pipe, const float *interleaved, int64_t frames)
 {
     if (!pipe || !interleaved || frames < 0) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return -1;
     }
     if (frames == 0) return 0;
-    AudioSignal &signal = *pipe->signal;
+    _audio_signal &signal = *pipe->signal;
     std::unique_lock<std::shared_mutex> writer(signal.access);
     const std::vector<SegmentsPtr> current = all_segments(signal);
     const size_t channels = current.size();
@@ -59,6 +59,7 @@ int64_t AUDIOSIGNAL_AppendToPipe(AUDIOSIGNAL_PIPE *pipe, const float *interleave
         open.erase(open.begin(), open.end() - int64_t(open.size()) % kChunkFrames);
     }
     install_segments(signal, next);
+    if (signal.regions) signal.regions->on_insert(pipe->position, frames);
     pipe->position += frames;
     return frames;
 }

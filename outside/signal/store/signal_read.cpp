@@ -36,7 +36,7 @@ bool channel_sums(AUDIOSIGNAL *signal, int channel, int64_t first, int64_t count
 {
     sum = sum2 = 0.0;
     if (!valid_channel(signal, channel) || count < 0) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return false;
     }
     SegmentsPtr segments = channel_segments(*signal, channel);
@@ -47,7 +47,7 @@ bool channel_sums(AUDIOSIGNAL *signal, int channel, int64_t first, int64_t count
             sum2 += double(x[i]) * x[i];
         }
     });
-    if (!ok) set_error(AUDIO_ERROR_READ);
+    if (!ok) set_last_error(AUDIO_ERROR_READ);
     return ok;
 }
 
@@ -58,7 +58,7 @@ extern "C" {
 int64_t AUDIOSIGNAL_GetChannelSamples(AUDIOSIGNAL *signal, int channel, int64_t first, float *out, int64_t count)
 {
     if (!valid_channel(signal, channel) || !out || count < 0) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return -1;
     }
     SegmentsPtr segments = channel_segments(*signal, channel);
@@ -71,7 +71,7 @@ int64_t AUDIOSIGNAL_GetChannelSamples(AUDIOSIGNAL *signal, int channel, int64_t 
     std::fill(out, out + before, 0.0f);
     std::fill(out + before + n, out + count, 0.0f);
     if (!segments->read(from, n, out + before)) {
-        set_error(AUDIO_ERROR_READ);
+        set_last_error(AUDIO_ERROR_READ);
         return -1;
     }
     return n;
@@ -81,7 +81,7 @@ int64_t AUDIOSIGNAL_GetMaskedSamplesWithStep(AUDIOSIGNAL *signal, uint32_t mask,
                                              int64_t count, int step)
 {
     if (!signal || !out || count < 0) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return -1;
     }
     if (step == 0) step = 1;
@@ -102,7 +102,7 @@ int64_t AUDIOSIGNAL_GetMaskedSamplesWithStep(AUDIOSIGNAL *signal, uint32_t mask,
     for (size_t c = 0; c < segments.size(); ++c) {
         if (!(mask >> c & 1u)) continue;
         if (!segments[c]->read(low, span, buffer.data())) {
-            set_error(AUDIO_ERROR_READ);
+            set_last_error(AUDIO_ERROR_READ);
             return -1;
         }
         for (int64_t k = 0; k < frames; ++k) out[k * width + slot] = buffer[size_t(first + k * step - low)];
@@ -119,7 +119,7 @@ int64_t AUDIOSIGNAL_GetMaskedSamples(AUDIOSIGNAL *signal, uint32_t mask, int64_t
 int AUDIOSIGNAL_InitAudioPointer(AUDIOSIGNAL *signal, AUDIOPOINTER *pointer, int64_t start, int channel)
 {
     if (!valid_channel(signal, channel) || !pointer) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     pointer->signal = signal;
@@ -135,7 +135,7 @@ int64_t AUDIOSIGNAL_GetChannelMinMaxFromAudioPointer(AUDIOSIGNAL *signal, AUDIOP
                                                      float *min, float *max)
 {
     if (!pointer || pointer->signal != signal || !valid_channel(signal, pointer->channel) || count < 0) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return -1;
     }
     SegmentsPtr segments = channel_segments(*signal, pointer->channel);

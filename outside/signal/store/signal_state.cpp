@@ -10,7 +10,7 @@ extern "C" {
 int AUDIOSIGNAL_SaveState(AUDIOSIGNAL *signal, AUDIOSIGNAL_STATE *state)
 {
     if (!signal || !state) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     std::memset(state, 0, sizeof *state);
@@ -29,7 +29,7 @@ int AUDIOSIGNAL_SaveState(AUDIOSIGNAL *signal, AUDIOSIGNAL_STATE *state)
 int AUDIOSIGNAL_RestoreState(AUDIOSIGNAL *signal, AUDIOSIGNAL_STATE *state)
 {
     if (!signal || !state || state->numChannels != signal->format.numChannels) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     std::vector<SegmentsPtr> saved;
@@ -47,7 +47,7 @@ int AUDIOSIGNAL_ClearState(AUDIOSIGNAL_STATE *state)
     {
         std::lock_guard<std::mutex> lists(list_lock());
         for (int c = 0; c < state->numChannels; ++c) {
-            AudioBlocksList *list = state->blocksList[c];
+            _audio_blocks_list *list = state->blocksList[c];
             if (--list->holds == 0 && !list->in_use) delete list;
         }
     }

@@ -118,7 +118,7 @@ AUDIOSIGNAL_STATSACC AUDIOSIGNAL_CalculateStatStart(AUDIOSIGNAL *signal)
 int AUDIOSIGNAL_CalculateStatsAcc(AUDIOSIGNAL_STATSACC *acc, AUDIOSIGNAL *signal, const AUDIOSIGNAL_STATSRANGE *range)
 {
     if (!acc || !signal || !range) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     const uint32_t mask = range->active_only ? AUDIOSIGNAL_GetActiveChannelMask(signal)
@@ -135,7 +135,7 @@ int AUDIOSIGNAL_CalculateStatsAcc(AUDIOSIGNAL_STATSACC *acc, AUDIOSIGNAL *signal
         acc->sampleRate = rate;
         acc->window = int32_t(window);
     } else if (acc->numChannels != int32_t(channels.size())) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);  // accumulated over another channel layout
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);  // accumulated over another channel layout
         return 0;
     }
     const std::vector<SegmentsPtr> segments = all_segments(*signal);
@@ -147,7 +147,7 @@ int AUDIOSIGNAL_CalculateStatsAcc(AUDIOSIGNAL_STATSACC *acc, AUDIOSIGNAL *signal
         for (int64_t at = begin; at < end; at += int64_t(buffer.size())) {
             const int64_t n = std::min(int64_t(buffer.size()), end - at);
             if (!segments[size_t(channels[i])]->read(at, n, buffer.data())) {
-                set_error(AUDIO_ERROR_READ);
+                set_last_error(AUDIO_ERROR_READ);
                 return 0;
             }
             pass.add(buffer.data(), n);
@@ -160,7 +160,7 @@ int AUDIOSIGNAL_CalculateStatsAcc(AUDIOSIGNAL_STATSACC *acc, AUDIOSIGNAL *signal
 int AUDIOSIGNAL_MergeStatsAcc(AUDIOSIGNAL_STATSACC *total, const AUDIOSIGNAL_STATSACC *part)
 {
     if (!total || !part) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     if (part->numChannels == 0 && part->window == 0) return 1;  // nothing accumulated
@@ -169,7 +169,7 @@ int AUDIOSIGNAL_MergeStatsAcc(AUDIOSIGNAL_STATSACC *total, const AUDIOSIGNAL_STA
         return 1;
     }
     if (total->numChannels != part->numChannels) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     for (int c = 0; c < total->numChannels; ++c) merge_channel(total->channel[c], part->channel[c]);
@@ -179,7 +179,7 @@ int AUDIOSIGNAL_MergeStatsAcc(AUDIOSIGNAL_STATSACC *total, const AUDIOSIGNAL_STA
 int AUDIOSIGNAL_GetStatisticsFromAcc(AUDIOSIGNAL_STATISTICS *out, AUDIOSIGNAL *signal, const AUDIOSIGNAL_STATSACC *acc)
 {
     if (!out || !signal || !acc || acc->numChannels < 0 || acc->numChannels > AUDIOSIGNAL_STATS_CHANNELS) {
-        set_error(AUDIO_ERROR_BAD_ARGUMENT);
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
         return 0;
     }
     std::memset(out, 0, sizeof *out);

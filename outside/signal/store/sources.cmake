@@ -6,9 +6,10 @@ list(APPEND VELMSIGNAL_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/signal_api.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_core.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_edit.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/signal_effect.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/signal_file.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_pipe.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_read.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_state.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_stats.cpp
-  ${CMAKE_CURRENT_LIST_DIR}/store_config.cpp
-  ${CMAKE_CURRENT_LIST_DIR}/store_errors.cpp)
+  ${CMAKE_CURRENT_LIST_DIR}/store_config.cpp)

@@ -1,16 +1,19 @@
 #include "outside/signal/store/store_config.hpp"
 
+#include "outside/base/blbase.h"
+
 namespace velmsig {
 
-// Fixed until the settings registry of the base library is available.
 std::string cache_folder()
 {
-    return "/tmp";
+    const char *folder = BLSETTINGS_GetStringEx(nullptr, "audiosignal.cache.folder=[/tmp]");
+    return folder && *folder ? folder : "/tmp";
 }
 
 int64_t memory_budget_bytes()
 {
-    return int64_t(512) << 20;
+    const int megabytes = BLSETTINGS_GetIntEx(nullptr, "audiosignal.cache.memorylimit=[512]");
+    return megabytes < 0 ? 0 : int64_t(megabytes) << 20;
 }
 
 }  // namespace velmsig
