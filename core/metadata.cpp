@@ -8,10 +8,10 @@ namespace {
 AUDIOMETADATA *metadata(VELMAUDIO doc, bool create)
 {
     if (!doc || !doc->signal) return nullptr;
-    AUDIOMETADATA *meta = AUDIOSIGNAL_GetMetadata(doc->signal);
+    AUDIOMETADATA *meta = AUDIOSIGNAL_GetMetaData(doc->signal);
     if (!meta && create) {
         meta = AUDIOMETADATA_Create();
-        if (meta && !AUDIOSIGNAL_SetMetadata(doc->signal, meta)) {
+        if (meta && !AUDIOSIGNAL_SetMetaData(doc->signal, meta)) {
             AUDIOMETADATA_Destroy(meta);
             meta = nullptr;
         }

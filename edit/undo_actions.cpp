@@ -11,15 +11,18 @@ using velm::RegionSnapshot;
 using velm::UndoAction;
 using velm::UndoKind;
 
+// The region record is public: its flag word, begin and length are the whole
+// of what an undo needs to put back.
 RegionSnapshot snapshot(AUDIOREGION *region)
 {
-    return {region, AUDIOREGION_GetFlags(region), AUDIOREGION_Begin(region), AUDIOREGION_Length(region)};
+    return {region, region->flags, region->begin, region->length};
 }
 
 void write_back(const RegionSnapshot &s)
 {
-    AUDIOREGION_SetFlags(s.region, s.flags);
-    AUDIOREGION_SetBounds(s.region, s.begin, s.length);
+    s.region->flags = s.flags;
+    s.region->begin = s.begin;
+    s.region->length = s.length;
 }
 
 int add(VELMUNDOSCRIPT *script, UndoAction &&action)
@@ -187,7 +190,7 @@ void revert_action(VELMAUDIO doc, UndoAction &a)
         }
         break;
     case UndoKind::RevertCreateRegion:
-        for (const RegionSnapshot &s : a.regions) AUDIOREGION_SetFlags(s.region, AUDIOREGION_GetFlags(s.region) | AUDIOREGION_FLAG_DELETED);
+        for (const RegionSnapshot &s : a.regions) s.region->flags |= AUDIOREGION_FLAG_DELETED;
         if (AUDIOSIGNAL *owner = region_signal(a)) AUDIOSIGNAL_AdjustRegionChildShares(owner);
         break;
     case UndoKind::ReplaceSignal:
