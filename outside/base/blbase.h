@@ -121,8 +121,9 @@ BL_API int BLSETTINGS_ExistsEx(BLSETTINGS settings, const char *format, ...) BL_
 /* Removes a key's value (its default stays); 0 when it had none. */
 BL_API int BLSETTINGS_DeleteEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 
-/* Reads "key" or "key=[default]": the value, else the default given in
- * brackets, else the registered default, else 0 / false / "".  Through the
+/* Reads "key" or "key=[default]": the value, else the registered default,
+ * else the default given in brackets (a key is missing only when it has
+ * neither value nor registered default), else 0 / false / "".  Through the
  * null handle the inserted objects are asked before the process-wide
  * registry, for values and then for defaults.  A text that does not read as
  * the wanted type gives way to the next one.  Numbers are read without

@@ -47,9 +47,9 @@ TEST_F(Settings, BracketedReadsFallBackInOrder)
     EXPECT_DOUBLE_EQ(BLSETTINGS_GetFloatEx(nullptr, "libvelm.missing"), 0.0);
     EXPECT_EQ(BLSETTINGS_GetBoolEx(nullptr, "libvelm.missing"), 0);
 
-    // The bracketed default beats the registered one; a value beats both.
+    // A registered default beats the bracketed one; a value beats both.
     BLSETTINGS_SetDefaultEx(nullptr, "libvelm.spectral.preset=wide");
-    EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset=[narrow]"), "narrow");
+    EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset=[narrow]"), "wide");
     EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset"), "wide");
     BLSETTINGS_ChangeEx(nullptr, "libvelm.spectral.preset=custom");
     EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset=[narrow]"), "custom");
