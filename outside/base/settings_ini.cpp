@@ -224,7 +224,7 @@ bool ValidKey(std::string_view key)
 
 bool LoadIniFile(const std::string &path, SettingEntries &entries, bool *damaged)
 {
-    FILE *file = std::fopen(path.c_str(), "rb");
+    FILE *file = std::fopen(path.c_str(), "rbe");
     if (!file) return false;
     std::string line, section;
     bool section_ok = true, too_long = false;
@@ -247,7 +247,7 @@ bool LoadIniFile(const std::string &path, SettingEntries &entries, bool *damaged
 bool SaveIniFile(const std::string &path, const SettingEntries &entries, bool keep_copy)
 {
     std::string temporary = path + ".XXXXXX";
-    const int fd = ::mkstemp(temporary.data());
+    const int fd = ::mkostemp(temporary.data(), O_CLOEXEC);
     if (fd < 0) {
         BLDEBUG_Error(-1, "BLSETTINGS: cannot write %s: %s", path.c_str(), std::strerror(errno));
         return false;
