@@ -39,7 +39,8 @@ BL_API int  BLCORE_Initialize(void);
 BL_API void BLCORE_Finalize(void);
 BL_API int  BLCORE_IsInitialized(void);
 
-/* Records a component's version; BLVERSION_String answers "name a.b.c.d". */
+/* Records a component's version (again: replaces it); BLVERSION_String
+ * writes "name a.b.c.d" cut to the buffer, and answers 0 for an unknown name. */
 BL_API int  BLVERSION_Register(const char *name, int major, int minor, int release, int build);
 BL_API int  BLVERSION_String(const char *name, char *buffer, int size);
 
@@ -56,7 +57,8 @@ typedef struct BLMemPool *BLMEM;
 /* A pool owns every block taken from it and frees them all when disposed.
  * Blocks are zero-filled, each is its own heap allocation.  Only the pool a
  * block came from can delete it (Delete answers 0 for any other pointer).
- * A pool is used by one thread at a time unless made with the thread-safe flag. */
+ * A pool is used by one thread at a time unless made with the thread-safe
+ * flag.  initial_size is only a hint: blocks are allocated one by one. */
 BL_API BLMEM   BLMEM_CreateMemDescrEx(const char *name, size_t initial_size, int flags);
 BL_API int     BLMEM_DisposeMemDescr(BLMEM pool);
 BL_API void   *BLMEM_New(BLMEM pool, size_t size);
