@@ -4,8 +4,8 @@
  * Layout: a key's first dotted part is its section and the rest its name, so
  * "libvelm.draw.hovertime=500" is written as "draw.hovertime=500" under
  * "[libvelm]".  Keys without a dot come first, before any section.
- * Values are written with backslash escapes for '\\', line breaks and a
- * leading '{'; secret values are written as "{obscured}" and hex digits.
+ * In values a backslash, the line breaks and a leading '{' are escaped with
+ * a backslash; secret values are written as "{obscured}" and hex digits.
  */
 #include "outside/base/blbase.h"
 #include "outside/base/base_internal.h"
