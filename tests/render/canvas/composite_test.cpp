@@ -208,10 +208,4 @@ TEST_F(Composite, ARectangleNarrowerThanTheEllipsisShowsNothingThatDoesNotFit)
     EXPECT_TRUE(Drawn().empty());
 }
 
-TEST_F(Composite, TheBevelFrameIsConstrainedFirst)
-{
-    EXPECT_EQ(VELMCANVAS_BevelRect(canvas, 10, 10, -3, 40), 0);
-    EXPECT_EQ(VELMCANVAS_BevelRect(canvas, 10, 10, 50, 40), 1);
-}
-
 } // namespace
