@@ -43,14 +43,7 @@ PICTURE Img_RegionRectBottomRight = AsImage(rect_bottom_right);
 
 namespace {
 
-class Bevel : public ::testing::Test {
-protected:
-    void SetUp() override { canvas = rec.MakeCanvas(400, 200); }
-    void TearDown() override { VELMCANVAS_DestroyCanvas(canvas); }
-
-    Recorder rec;
-    VELMCANVAS canvas = nullptr;
-};
+using Bevel = velm::test::RecordingCanvas;
 
 TEST_F(Bevel, WideRegionsGetRoundedPiecesAroundThem)
 {

@@ -11,11 +11,8 @@ using Calls = std::vector<std::string>;
 
 namespace {
 
-class Composite : public ::testing::Test {
+class Composite : public velm::test::RecordingCanvas {
 protected:
-    void SetUp() override { canvas = rec.MakeCanvas(400, 200); }
-    void TearDown() override { VELMCANVAS_DestroyCanvas(canvas); }
-
     Calls Drawn() const
     {
         Calls drawn;
@@ -27,8 +24,6 @@ protected:
         return drawn;
     }
 
-    Recorder rec;
-    VELMCANVAS canvas = nullptr;
 };
 
 TEST_F(Composite, SharpRectanglesMayReachJustPastTheEdges)
