@@ -102,6 +102,21 @@ TEST(QtCanvasLife, DestroyingACanvasReleasesTheHostsPainter)
     EXPECT_FALSE(painter.isActive());
 }
 
+TEST(QtCanvasLife, DestroyingACanvasLeavesThePainterOnAnotherCanvasAlone)
+{
+    VELMCANVAS first = VELMCANVAS_CreateCanvasQT(nullptr, 50, 80);
+    VELMCANVAS second = VELMCANVAS_CreateCanvasQT(nullptr, 50, 80);
+    QPainter painter;
+    VELMCANVAS_BeginDraw(first, &painter);
+    VELMCANVAS_SelectTarget(first, VELMCANVASTARGET_OUTPUT);
+    VELMCANVAS_BeginDraw(second, &painter);
+    VELMCANVAS_SelectTarget(second, VELMCANVASTARGET_OUTPUT);
+    VELMCANVAS_DestroyCanvas(first);
+    EXPECT_TRUE(painter.isActive());
+    VELMCANVAS_DestroyCanvas(second);
+    EXPECT_FALSE(painter.isActive());
+}
+
 TEST_F(QtCanvas, LinesLeaveOutTheirLastPixelGoingRightAndStartPastTheFirstGoingLeft)
 {
     VELMCANVAS_SelectColor(canvas, kRed);
@@ -213,6 +228,11 @@ TEST_F(QtCanvas, BlocksMoveIntactAcrossOverlapAndBetweenTargets)
     EXPECT_EQ(out.pixel(101, 55), Opaque(kRed));
     EXPECT_EQ(out.pixel(119, 55), Opaque(kBlue));
     EXPECT_EQ(out.pixel(16, 15), Opaque(0x000000));
+
+    // Areas reaching past the surface move only the part on it, to where
+    // that part belongs.
+    EXPECT_EQ(VELMCANVAS_MoveBlock(canvas, -10, 50, 100000, 100000, 30, 20), 1);
+    EXPECT_EQ(Output().pixel(141, 25), Opaque(kRed));
 
     // Drawing keeps going to the current target after cross-target copies.
     VELMCANVAS_SelectColor(canvas, kBlue);
