@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <new>
+#include <optional>
 
 namespace velm::canvas::qt {
 namespace {
@@ -22,17 +23,29 @@ QPixmap TransparentPixmap(int width, int height)
     return pixmap;
 }
 
+// Coordinates are kept within this reach of the origin.
+constexpr long long kReach = 1LL << 24;
+
+int Clamped(long long value)
+{
+    return static_cast<int>(std::clamp(value, -kReach, kReach));
+}
+
 // The part of an area that lies on the pixmap, and where it lands when the
-// area is moved to `dest`.  Copying only that part keeps absurd areas cheap.
+// area is moved to (dest_x, dest_y).  Copying only that part keeps absurd
+// areas cheap; nothing when no part lies on the pixmap.
 struct Block {
     QPixmap pixels;
     QPoint dest;
 };
 
-Block CopyBlock(const QPixmap &from, const QRect &area, QPoint dest)
+std::optional<Block> CopyBlock(const QPixmap &from, int x, int y, int width, int height, int dest_x, int dest_y)
 {
-    const QRect on_pixmap = area & from.rect();
-    return {from.copy(on_pixmap), dest + (on_pixmap.topLeft() - area.topLeft())};
+    const QRect part = SafeRect(x, y, width, height) & from.rect();
+    if (part.isEmpty()) return std::nullopt;
+    const QPoint dest(Clamped(static_cast<long long>(dest_x) + part.left() - x),
+                      Clamped(static_cast<long long>(dest_y) + part.top() - y));
+    return Block{from.copy(part), dest};
 }
 
 void ApplyHints(QPainter *painter, bool low_profile)
@@ -43,6 +56,14 @@ void ApplyHints(QPainter *painter, bool low_profile)
 }
 
 } // namespace
+
+QRect SafeRect(int x, int y, int width, int height)
+{
+    const int left = Clamped(x), top = Clamped(y);
+    const int right = Clamped(static_cast<long long>(x) + std::max(width, 0));
+    const int bottom = Clamped(static_cast<long long>(y) + std::max(height, 0));
+    return QRect(left, top, right - left, bottom - top);
+}
 
 bool HaveGuiApplication()
 {
@@ -268,10 +289,11 @@ int _MoveBlock(_VELMCANVASDATA *d, int x, int y, int width, int height, int dest
     QPainter *painter = Painting(d);
     if (!painter) return 0;
     // Through a copy, so that overlapping areas move intact.
-    const Block block = CopyBlock(*d->target, QRect(x, y, width, height), QPoint(dest_x, dest_y));
+    const std::optional<Block> block = CopyBlock(*d->target, x, y, width, height, dest_x, dest_y);
+    if (!block) return 1;
     painter->save();
     painter->setCompositionMode(QPainter::CompositionMode_Source);
-    painter->drawPixmap(block.dest, block.pixels);
+    painter->drawPixmap(block->dest, block->pixels);
     painter->restore();
     return 1;
 }
@@ -280,12 +302,22 @@ int _MoveBlock2(_VELMCANVASDATA *d, int source, int x, int y, int width, int hei
                 int dest_x, int dest_y)
 {
     if (!Painting(d)) return 0;
-    const Block block = CopyBlock(*TargetPixmap(d, source), QRect(x, y, width, height), QPoint(dest_x, dest_y));
+    const std::optional<Block> block = CopyBlock(*TargetPixmap(d, source), x, y, width, height, dest_x, dest_y);
+    if (!block) return 1;
     if (!StartPainter(d, TargetPixmap(d, destination))) return 0;
     d->painter->setCompositionMode(QPainter::CompositionMode_Source);
-    d->painter->drawPixmap(block.dest, block.pixels);
+    d->painter->drawPixmap(block->dest, block->pixels);
     return ResumeTarget(d);
 }
+
+namespace {
+
+QRect DrawArea(const _VELMCANVASDATA *d)
+{
+    return SafeRect(d->draw_area.left, d->draw_area.top, d->draw_area.width, d->draw_area.height);
+}
+
+} // namespace
 
 int _SetDrawArea(_VELMCANVASDATA *d, const _VELMRECT *rect)
 {
@@ -293,7 +325,7 @@ int _SetDrawArea(_VELMCANVASDATA *d, const _VELMRECT *rect)
     if (!painter) return 0;
     d->draw_area = *rect;
     ++d->clip_depth;
-    d->clip = QRegion(rect->left, rect->top, rect->width, rect->height);
+    d->clip = QRegion(DrawArea(d));
     painter->setClipRegion(*d->clip);
     return 1;
 }
@@ -302,10 +334,8 @@ int _ProtectDrawArea(_VELMCANVASDATA *d, const _VELMRECT *rect)
 {
     QPainter *painter = Painting(d);
     if (!painter) return 0;
-    QRegion region = QRegion(0, 0, d->width, d->height) - QRegion(rect->left, rect->top, rect->width, rect->height);
-    if (d->clip_depth != 0) {
-        region &= QRegion(d->draw_area.left, d->draw_area.top, d->draw_area.width, d->draw_area.height);
-    }
+    QRegion region = QRegion(0, 0, d->width, d->height) - SafeRect(rect->left, rect->top, rect->width, rect->height);
+    if (d->clip_depth != 0) region &= DrawArea(d);
     d->clip = region;
     painter->setClipRegion(region);
     ++d->clip_depth;
@@ -319,7 +349,7 @@ int _ClearDrawArea(_VELMCANVASDATA *d)
     painter->setClipping(false);
     d->clip.reset();
     if (d->clip_depth >= 2) {
-        d->clip = QRegion(d->draw_area.left, d->draw_area.top, d->draw_area.width, d->draw_area.height);
+        d->clip = QRegion(DrawArea(d));
         painter->setClipRegion(*d->clip);
     }
     if (d->clip_depth > 0) --d->clip_depth;

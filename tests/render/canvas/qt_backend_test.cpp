@@ -6,6 +6,7 @@
 #include <QTemporaryDir>
 
 #include <cstring>
+#include <limits>
 #include <string>
 #include <vector>
 
@@ -262,6 +263,32 @@ TEST_F(QtCanvas, BlocksMoveIntactAcrossOverlapAndBetweenTargets)
     VELMCANVAS_SelectColor(canvas, kBlue);
     VELMCANVAS_FillRect(canvas, 0, 0, 3, 3, 0);
     EXPECT_EQ(Output().pixel(1, 1), Opaque(kBlue));
+}
+
+TEST_F(QtCanvas, AbsurdCoordinatesAreSurvivedWithoutDrawing)
+{
+    constexpr int kFar = std::numeric_limits<int>::max();
+    constexpr int kNear = std::numeric_limits<int>::min();
+    const _VELMRECT far_area{kFar - 5, kNear, kFar, kFar, 0, 0};
+    const unsigned char index = 7;
+    VELMCANVAS_SelectColor(canvas, kRed);
+    VELMCANVAS_SaveOverlay(canvas, kFar - 1, kFar - 1, kFar, kFar);
+    VELMCANVAS_MoveBlock(canvas, kNear, kNear, kFar, kFar, kFar, kFar);
+    VELMCANVAS_MoveBlock2(canvas, 1, kFar, kFar, kFar, kFar, 2, kNear, kNear);
+    VELMCANVAS_DrawLine(canvas, kFar, kNear, kNear, kFar);
+    VELMCANVAS_DrawAlphaRect(canvas, kFar, kFar, kFar, kFar, VELMCANVASALPHA_DARKTOP);
+    VELMCANVAS_PutImage(canvas, kFar, kFar, kFar, kFar, &index, 1, 1, 1, kNear, kFar, kFar, kFar);
+    VELMCANVAS_TextOut(canvas, kFar, kFar, "far");
+    VELMCANVAS_FillRect(canvas, kNear, kNear, kFar, kFar, 0);
+    VELMCANVAS_FillRect(canvas, -10, -10, kFar, kFar, 0);
+    VELMCANVAS_ShadowRect(canvas, kFar, kFar, kFar, kFar, kFar, 0xFF000010);
+    VELMCANVAS_SetDrawArea(canvas, &far_area);
+    VELMCANVAS_ProtectDrawArea(canvas, &far_area);
+    VELMCANVAS_ClearDrawArea(canvas);
+    VELMCANVAS_ClearDrawArea(canvas);
+    VELMCANVAS_RestoreOverlay(canvas);
+    // The far fill was cut to the surface, which it covers.
+    EXPECT_EQ(Output().pixel(80, 50), Opaque(kRed));
 }
 
 TEST_F(QtCanvas, ClearMakesTheTargetTransparent)
