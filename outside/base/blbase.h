@@ -48,8 +48,13 @@ typedef struct BLMemPool *BLMEM;
 /* Pool flags. */
 #define BLMEM_FLAG_THREADSAFE 0x8 /* the pool may be used from several threads */
 
+/* Larger block requests fail (null) instead of exhausting the machine. */
+#define BLMEM_MAX_BLOCK_SIZE ((size_t)1 << 32)
+
 /* A pool owns every block taken from it and frees them all when disposed.
- * Blocks are zero-filled. */
+ * Blocks are zero-filled, each is its own heap allocation.  Only the pool a
+ * block came from can delete it (Delete answers 0 for any other pointer).
+ * A pool is used by one thread at a time unless made with the thread-safe flag. */
 BL_API BLMEM   BLMEM_CreateMemDescrEx(const char *name, size_t initial_size, int flags);
 BL_API int     BLMEM_DisposeMemDescr(BLMEM pool);
 BL_API void   *BLMEM_New(BLMEM pool, size_t size);

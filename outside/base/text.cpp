@@ -1,0 +1,76 @@
+#include "outside/base/base_internal.h"
+
+#include <algorithm>
+#include <cctype>
+#include <cstdio>
+#include <mutex>
+#include <unordered_set>
+
+namespace blbase {
+
+bool FormatText(std::string &out, const char *format, va_list args)
+{
+    if (!format) return false;
+    va_list copy;
+    va_copy(copy, args);
+    char small[256];
+    const int length = std::vsnprintf(small, sizeof small, format, copy);
+    va_end(copy);
+    if (length < 0) return false;
+    if (static_cast<size_t>(length) < sizeof small) {
+        out.assign(small, static_cast<size_t>(length));
+        return true;
+    }
+    out.resize(static_cast<size_t>(length));
+    std::vsnprintf(out.data(), out.size() + 1, format, args);
+    return true;
+}
+
+namespace {
+
+struct InternTable {
+    std::mutex lock;
+    // Node-based set: the characters of an element never move while it lives.
+    std::unordered_set<std::string> texts;
+};
+
+InternTable &Interned()
+{
+    // Never destroyed, so texts stay readable by code running during exit.
+    static InternTable *table = new InternTable;
+    return *table;
+}
+
+} // namespace
+
+const char *InternText(std::string_view text)
+{
+    InternTable &table = Interned();
+    std::lock_guard guard(table.lock);
+    return table.texts.emplace(text).first->c_str();
+}
+
+void ClearInternedTexts()
+{
+    InternTable &table = Interned();
+    std::lock_guard guard(table.lock);
+    table.texts.clear();
+}
+
+std::string ToLower(std::string_view text)
+{
+    std::string lower(text);
+    std::transform(lower.begin(), lower.end(), lower.begin(),
+                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+    return lower;
+}
+
+std::string_view Trim(std::string_view text)
+{
+    const auto space = [](char c) { return c == ' ' || c == '\t' || c == '\r' || c == '\n'; };
+    while (!text.empty() && space(text.front())) text.remove_prefix(1);
+    while (!text.empty() && space(text.back())) text.remove_suffix(1);
+    return text;
+}
+
+} // namespace blbase
