@@ -29,7 +29,9 @@ constexpr int kTopHeight = 12; // top pieces: 3 above, 9 inside
 constexpr int kBottomHeight = 16;
 constexpr int kCornerWidth = 12;
 constexpr int kRectSide = 2;   // width of a square corner and side
-constexpr qreal kRadius = 7.0; // the region fill's corner size 14, halved
+// Close to the region fill's own rounding (corner size 14), and the arcs end
+// exactly where the corner pieces do, so the straight edges join them cleanly.
+constexpr qreal kRadius = 6.0;
 constexpr int kModelSide = 40; // big enough for straight stretches between corners
 
 // Signed distance from p to a rectangle with rounded corners (negative inside).
