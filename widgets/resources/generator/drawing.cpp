@@ -37,6 +37,16 @@ void FillGlyph(QPainter &painter, const QPainterPath &path)
     painter.restore();
 }
 
+QPainterPath Cross(const QRectF &box)
+{
+    QPainterPath cross;
+    cross.moveTo(box.topLeft());
+    cross.lineTo(box.bottomRight());
+    cross.moveTo(box.topRight());
+    cross.lineTo(box.bottomLeft());
+    return cross;
+}
+
 void DrawMagnifier(QPainter &painter, qreal cx, qreal cy, qreal radius)
 {
     QPainterPath lens;

@@ -30,6 +30,9 @@ void StrokeGlyph(QPainter &painter, const QPainterPath &path, qreal width);
 // Fills a path in light ink with a one-pixel dark halo around it.
 void FillGlyph(QPainter &painter, const QPainterPath &path);
 
+// The two strokes of an X from corner to corner of the box.
+QPainterPath Cross(const QRectF &box);
+
 // A magnifier: lens centred at (cx, cy) with the given radius, handle
 // towards the bottom right.  Returns nothing; draws with StrokeGlyph.
 void DrawMagnifier(QPainter &painter, qreal cx, qreal cy, qreal radius);

@@ -19,14 +19,8 @@ QImage DrawVolume(int waves)
     speaker.lineTo(8.5, 18.5);
     speaker.closeSubpath();
     FillGlyph(painter, speaker.simplified());
-    QPainterPath marks;
-    if (waves < 0) {
-        // Muted: a cross where the waves would be.
-        marks.moveTo(18.5, 11.5);
-        marks.lineTo(25.5, 18.5);
-        marks.moveTo(25.5, 11.5);
-        marks.lineTo(18.5, 18.5);
-    }
+    // Muted: a cross where the waves would be.
+    QPainterPath marks = waves < 0 ? Cross(QRectF(18.5, 11.5, 7, 7)) : QPainterPath();
     for (int wave = 1; wave <= waves; ++wave) {
         const qreal radius = 0.5 + 4.0 * wave;
         const QRectF box(14.5 - radius, 15.0 - radius, 2 * radius, 2 * radius);
@@ -63,13 +57,8 @@ QImage DrawCancel()
     painter.setBrush(QColor(190, 40, 30));
     painter.setPen(QPen(QColor(80, 10, 5, 220), 1.0));
     painter.drawEllipse(QPointF(8, 8), 6.5, 6.5);
-    QPainterPath cross;
-    cross.moveTo(5.5, 5.5);
-    cross.lineTo(10.5, 10.5);
-    cross.moveTo(10.5, 5.5);
-    cross.lineTo(5.5, 10.5);
     painter.setPen(QPen(kGlyph, 1.6, Qt::SolidLine, Qt::RoundCap));
-    painter.drawPath(cross);
+    painter.drawPath(Cross(QRectF(5.5, 5.5, 5, 5)));
     return image;
 }
 

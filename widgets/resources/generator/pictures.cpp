@@ -6,81 +6,64 @@ namespace {
 using enum FrameLook;
 using enum FramePiece;
 
-template <FrameLook look, FramePiece piece>
-QImage Frame()
+// A picture drawn by one of the parameterised painters.
+template <auto draw, auto... arguments>
+QImage With()
 {
-    return DrawFramePiece(look, piece);
-}
-
-template <SliderKind kind>
-QImage Slider()
-{
-    return DrawSlider(kind);
-}
-
-template <ZoomFace face>
-QImage Zoom()
-{
-    return DrawZoomButton(face);
-}
-
-template <int waves>
-QImage Volume()
-{
-    return DrawVolume(waves);
+    return draw(arguments...);
 }
 
 const PictureSpec kPictures[] = {
     {"Background", DrawBackgroundTile},
-    {"BottomCursorSlider", Slider<SliderKind::EditBottom>},
+    {"BottomCursorSlider", With<DrawSlider, SliderKind::EditBottom>},
     {"Cancel", DrawCancel},
-    {"LeftSelectionSlider", Slider<SliderKind::SelectionBegin>},
-    {"Lupa", [] { return DrawMagnifierIcon(false); }},
-    {"LupaMenu", [] { return DrawMagnifierIcon(true); }},
+    {"LeftSelectionSlider", With<DrawSlider, SliderKind::SelectionBegin>},
+    {"Lupa", With<DrawMagnifierIcon, false>},
+    {"LupaMenu", With<DrawMagnifierIcon, true>},
     {"Mouse", DrawMouse},
     {"PlayOverlay", DrawPlayOverlay},
-    {"RedCursorSlider", Slider<SliderKind::Play>},
-    {"RegionRaggedLeft", Frame<Plain, RaggedLeft>},
-    {"RegionRaggedRight", Frame<Plain, RaggedRight>},
-    {"RegionRectBottomLeft", Frame<Plain, RectBottomLeft>},
-    {"RegionRectBottomOpen", Frame<Plain, RectBottom>},
-    {"RegionRectBottomRight", Frame<Plain, RectBottomRight>},
-    {"RegionRectLeft", Frame<Plain, RectLeft>},
-    {"RegionRectOpen", Frame<Plain, RectWhole>},
-    {"RegionRectRight", Frame<Plain, RectRight>},
-    {"RegionRectTopLeft", Frame<Plain, RectTopLeft>},
-    {"RegionRectTopOpen", Frame<Plain, RectTop>},
-    {"RegionRectTopRight", Frame<Plain, RectTopRight>},
-    {"RegionRoundBottomLeftOpen", Frame<Plain, RoundBottomLeft>},
-    {"RegionRoundBottomRightOpen", Frame<Plain, RoundBottomRight>},
-    {"RegionRoundLeftOpen", Frame<Plain, RoundLeft>},
-    {"RegionRoundRightOpen", Frame<Plain, RoundRight>},
-    {"RegionRoundTopLeftOpen", Frame<Plain, RoundTopLeft>},
-    {"RegionRoundTopRightOpen", Frame<Plain, RoundTopRight>},
-    {"RightSelectionSlider", Slider<SliderKind::SelectionEnd>},
-    {"SelRegionRectBottomOpen", Frame<Selected, RectBottom>},
-    {"SelRegionRectLeft", Frame<Selected, RectLeft>},
-    {"SelRegionRectOpen", Frame<Selected, RectWhole>},
-    {"SelRegionRectRight", Frame<Selected, RectRight>},
-    {"SelRegionRectTopOpen", Frame<Selected, RectTop>},
-    {"SelRegionRoundBottomLeftOpen", Frame<Selected, RoundBottomLeft>},
-    {"SelRegionRoundBottomRightOpen", Frame<Selected, RoundBottomRight>},
-    {"SelRegionRoundLeftOpen", Frame<Selected, RoundLeft>},
-    {"SelRegionRoundRightOpen", Frame<Selected, RoundRight>},
-    {"SelRegionRoundTopLeftOpen", Frame<Selected, RoundTopLeft>},
-    {"SelRegionRoundTopRightOpen", Frame<Selected, RoundTopRight>},
-    {"TopCursorSlider", Slider<SliderKind::EditTop>},
-    {"TransparentCursorSlider", Slider<SliderKind::Selection>},
-    {"Volume33", Volume<1>},
-    {"Volume66", Volume<2>},
-    {"VolumeOff", Volume<-1>},
-    {"VolumeOn", Volume<3>},
-    {"ZoomFull", Zoom<ZoomFace::Full>},
-    {"ZoomIn", Zoom<ZoomFace::In>},
-    {"ZoomOut", Zoom<ZoomFace::Out>},
-    {"ZoomSelection", Zoom<ZoomFace::Selection>},
-    {"ZoomVertIn", Zoom<ZoomFace::VerticalIn>},
-    {"ZoomVertOut", Zoom<ZoomFace::VerticalOut>},
+    {"RedCursorSlider", With<DrawSlider, SliderKind::Play>},
+    {"RegionRaggedLeft", With<DrawFramePiece, Plain, RaggedLeft>},
+    {"RegionRaggedRight", With<DrawFramePiece, Plain, RaggedRight>},
+    {"RegionRectBottomLeft", With<DrawFramePiece, Plain, RectBottomLeft>},
+    {"RegionRectBottomOpen", With<DrawFramePiece, Plain, RectBottom>},
+    {"RegionRectBottomRight", With<DrawFramePiece, Plain, RectBottomRight>},
+    {"RegionRectLeft", With<DrawFramePiece, Plain, RectLeft>},
+    {"RegionRectOpen", With<DrawFramePiece, Plain, RectWhole>},
+    {"RegionRectRight", With<DrawFramePiece, Plain, RectRight>},
+    {"RegionRectTopLeft", With<DrawFramePiece, Plain, RectTopLeft>},
+    {"RegionRectTopOpen", With<DrawFramePiece, Plain, RectTop>},
+    {"RegionRectTopRight", With<DrawFramePiece, Plain, RectTopRight>},
+    {"RegionRoundBottomLeftOpen", With<DrawFramePiece, Plain, RoundBottomLeft>},
+    {"RegionRoundBottomRightOpen", With<DrawFramePiece, Plain, RoundBottomRight>},
+    {"RegionRoundLeftOpen", With<DrawFramePiece, Plain, RoundLeft>},
+    {"RegionRoundRightOpen", With<DrawFramePiece, Plain, RoundRight>},
+    {"RegionRoundTopLeftOpen", With<DrawFramePiece, Plain, RoundTopLeft>},
+    {"RegionRoundTopRightOpen", With<DrawFramePiece, Plain, RoundTopRight>},
+    {"RightSelectionSlider", With<DrawSlider, SliderKind::SelectionEnd>},
+    {"SelRegionRectBottomOpen", With<DrawFramePiece, Selected, RectBottom>},
+    {"SelRegionRectLeft", With<DrawFramePiece, Selected, RectLeft>},
+    {"SelRegionRectOpen", With<DrawFramePiece, Selected, RectWhole>},
+    {"SelRegionRectRight", With<DrawFramePiece, Selected, RectRight>},
+    {"SelRegionRectTopOpen", With<DrawFramePiece, Selected, RectTop>},
+    {"SelRegionRoundBottomLeftOpen", With<DrawFramePiece, Selected, RoundBottomLeft>},
+    {"SelRegionRoundBottomRightOpen", With<DrawFramePiece, Selected, RoundBottomRight>},
+    {"SelRegionRoundLeftOpen", With<DrawFramePiece, Selected, RoundLeft>},
+    {"SelRegionRoundRightOpen", With<DrawFramePiece, Selected, RoundRight>},
+    {"SelRegionRoundTopLeftOpen", With<DrawFramePiece, Selected, RoundTopLeft>},
+    {"SelRegionRoundTopRightOpen", With<DrawFramePiece, Selected, RoundTopRight>},
+    {"TopCursorSlider", With<DrawSlider, SliderKind::EditTop>},
+    {"TransparentCursorSlider", With<DrawSlider, SliderKind::Selection>},
+    {"Volume33", With<DrawVolume, 1>},
+    {"Volume66", With<DrawVolume, 2>},
+    {"VolumeOff", With<DrawVolume, -1>},
+    {"VolumeOn", With<DrawVolume, 3>},
+    {"ZoomFull", With<DrawZoomButton, ZoomFace::Full>},
+    {"ZoomIn", With<DrawZoomButton, ZoomFace::In>},
+    {"ZoomOut", With<DrawZoomButton, ZoomFace::Out>},
+    {"ZoomSelection", With<DrawZoomButton, ZoomFace::Selection>},
+    {"ZoomVertIn", With<DrawZoomButton, ZoomFace::VerticalIn>},
+    {"ZoomVertOut", With<DrawZoomButton, ZoomFace::VerticalOut>},
 };
 
 } // namespace
