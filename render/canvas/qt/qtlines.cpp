@@ -68,7 +68,8 @@ int _DrawPoint(_VELMCANVASDATA *d, int x, int y, uint32_t color)
     pen.setColor(ToColor(color, 255));
     painter->save();
     painter->setPen(pen);
-    painter->drawPoint(Centre(x, y));
+    // Qt places an integer point on its pixel whatever the antialiasing.
+    painter->drawPoint(QPoint(x, y));
     painter->restore();
     return 1;
 }

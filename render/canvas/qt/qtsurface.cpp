@@ -22,6 +22,19 @@ QPixmap TransparentPixmap(int width, int height)
     return pixmap;
 }
 
+// The part of an area that lies on the pixmap, and where it lands when the
+// area is moved to `dest`.  Copying only that part keeps absurd areas cheap.
+struct Block {
+    QPixmap pixels;
+    QPoint dest;
+};
+
+Block CopyBlock(const QPixmap &from, const QRect &area, QPoint dest)
+{
+    const QRect on_pixmap = area & from.rect();
+    return {from.copy(on_pixmap), dest + (on_pixmap.topLeft() - area.topLeft())};
+}
+
 void ApplyHints(QPainter *painter, bool low_profile)
 {
     painter->setRenderHint(QPainter::Antialiasing, !low_profile);
@@ -137,8 +150,12 @@ _VELMCANVASDATA *_CreateCanvas(void *, int width, int height)
 int _DestroyCanvas(_VELMCANVASDATA *d)
 {
     if (!d) return 0;
-    // The host keeps its painter: it must not stay on a pixmap that goes away.
-    if (d->painter && d->painter->isActive()) d->painter->end();
+    // The host keeps its painter: it must not stay on a pixmap that goes
+    // away, but may by now be painting another canvas.
+    if (d->painter && d->painter->isActive()) {
+        const QPaintDevice *device = d->painter->device();
+        if (device == &d->output || device == &d->memory || device == &d->overlay) d->painter->end();
+    }
     delete d;
     return 1;
 }
@@ -251,10 +268,10 @@ int _MoveBlock(_VELMCANVASDATA *d, int x, int y, int width, int height, int dest
     QPainter *painter = Painting(d);
     if (!painter) return 0;
     // Through a copy, so that overlapping areas move intact.
-    const QPixmap block = d->target->copy(x, y, width, height);
+    const Block block = CopyBlock(*d->target, QRect(x, y, width, height), QPoint(dest_x, dest_y));
     painter->save();
     painter->setCompositionMode(QPainter::CompositionMode_Source);
-    painter->drawPixmap(dest_x, dest_y, block);
+    painter->drawPixmap(block.dest, block.pixels);
     painter->restore();
     return 1;
 }
@@ -263,10 +280,10 @@ int _MoveBlock2(_VELMCANVASDATA *d, int source, int x, int y, int width, int hei
                 int dest_x, int dest_y)
 {
     if (!Painting(d)) return 0;
-    const QPixmap block = TargetPixmap(d, source)->copy(x, y, width, height);
+    const Block block = CopyBlock(*TargetPixmap(d, source), QRect(x, y, width, height), QPoint(dest_x, dest_y));
     if (!StartPainter(d, TargetPixmap(d, destination))) return 0;
     d->painter->setCompositionMode(QPainter::CompositionMode_Source);
-    d->painter->drawPixmap(dest_x, dest_y, block);
+    d->painter->drawPixmap(block.dest, block.pixels);
     return ResumeTarget(d);
 }
 
