@@ -1,10 +1,12 @@
 // The Qt back-end's behaviour, checked on the pixels it produces.
+#include "outside/base/blbase.h"
 #include "render/canvas/qt_fixture.h"
 
 #include <QBuffer>
 #include <QTemporaryDir>
 
 #include <cstring>
+#include <string>
 #include <vector>
 
 using velm::test::Opaque;
@@ -89,6 +91,28 @@ TEST(QtCanvasLife, NothingPaintsOutsideBeginAndEndDraw)
     EXPECT_EQ(shown.pixel(5, 5), Opaque(kRed));
     EXPECT_EQ(shown.pixel(15, 5), 0u);
     VELMCANVAS_DestroyCanvas(canvas);
+}
+
+TEST(QtCanvasLife, PaintingWithoutAPainterIsLoggedAndGrowingIsReported)
+{
+    std::vector<std::string> messages;
+    const int level = BLDEBUG_GetLevel();
+    BLDEBUG_SetLevel(BLDEBUG_LEVEL_ALL);
+    BLDEBUG_SetSink([](int, int, const char *message, void *user) {
+        static_cast<std::vector<std::string> *>(user)->push_back(message);
+    }, &messages);
+    VELMCANVAS canvas = VELMCANVAS_CreateCanvasQT(nullptr, 50, 80);
+    EXPECT_EQ(VELMCANVAS_DrawLine(canvas, 0, 0, 5, 5), 0);
+    EXPECT_EQ(VELMCANVAS_ResizeCanvas(canvas, 60, 90), 1);
+    EXPECT_EQ(VELMCANVAS_ResizeCanvas(canvas, 20000, 90), 0);
+    VELMCANVAS_DestroyCanvas(canvas);
+    BLDEBUG_SetSink(nullptr, nullptr);
+    BLDEBUG_SetLevel(level);
+    ASSERT_EQ(messages.size(), 4u);
+    EXPECT_EQ(messages[0], "VELM CANVAS QT: Missing VELMCANVAS_BeginDraw(...)");
+    EXPECT_EQ(messages[1], "VELMCANVAS_ResizeCanvas: Canvas resized (60,90)");
+    EXPECT_EQ(messages[2], "VELM CANVAS QT: Refused canvas dimensions (20000,90)");
+    EXPECT_EQ(messages[3], "VELMCANVAS_ResizeCanvas: Unable to create new canvas with dimensions = (20000,90)");
 }
 
 TEST(QtCanvasLife, DestroyingACanvasReleasesTheHostsPainter)
