@@ -2,13 +2,13 @@
 #include "outside/signal/file/formats_internal.hpp"
 
 #include <sndfile.h>
-#include <strings.h>
 
 #include <cmath>
 #include <cstdio>
 #include <vector>
 
 #include "outside/signal/audioformat.h"
+#include "outside/signal/file/text_internal.hpp"
 
 namespace velmsig {
 
@@ -188,9 +188,7 @@ bool is_float_coding(int coding) { return coding == AUDIO_FORMAT_FLOAT || coding
 
 const FormatName *find_format_name(std::string_view name) {
     for (const auto &n : kNames)
-        if (name.size() == std::char_traits<char>::length(n.name) &&
-            strncasecmp(name.data(), n.name, name.size()) == 0)
-            return &n;
+        if (equals_nocase(name, n.name)) return &n;
     return nullptr;
 }
 

@@ -1,13 +1,13 @@
 #include "outside/signal/file/link_internal.hpp"
 
 #include <fcntl.h>
-#include <strings.h>
 #include <sys/stat.h>
 
 #include <string_view>
 
 #include "outside/signal/audioformat.h"
 #include "outside/signal/file/lasterror_internal.hpp"
+#include "outside/signal/file/text_internal.hpp"
 #include "outside/signal/file/unique_fd_internal.hpp"
 
 namespace velmsig {
@@ -20,10 +20,6 @@ std::string_view trim(std::string_view s) {
     while (!s.empty() && (s.front() == ' ' || s.front() == '\t' || s.front() == '\r')) s.remove_prefix(1);
     while (!s.empty() && (s.back() == ' ' || s.back() == '\t' || s.back() == '\r')) s.remove_suffix(1);
     return s;
-}
-
-bool equals_nocase(std::string_view a, std::string_view b) {
-    return a.size() == b.size() && strncasecmp(a.data(), b.data(), a.size()) == 0;
 }
 
 // Calls f(full key, value) for each "key=value" line; sections prefix keys.
@@ -72,8 +68,7 @@ bool read_link(const char *path, LinkTarget *out) {
     UniqueFd fd(::open(path, O_RDONLY | O_CLOEXEC));
     struct stat st{};
     if (!fd || fstat(fd.get(), &st) != 0) {
-        set_last_error(errno == ENOENT ? AUDIO_ERROR_FILE_NOT_FOUND
-                       : errno == EACCES ? AUDIO_ERROR_ACCESS_DENIED : AUDIO_ERROR_READ);
+        set_last_error(error_of_errno(errno, AUDIO_ERROR_READ));
         return false;
     }
     if (st.st_size > static_cast<off_t>(kMaxLinkSize)) {

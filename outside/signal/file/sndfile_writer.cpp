@@ -27,15 +27,6 @@ FileWriter::~FileWriter() = default;
 
 namespace {
 
-int error_of_errno(int e) {
-    switch (e) {
-        case ENOENT: case ENOTDIR: return AUDIO_ERROR_FILE_NOT_FOUND;
-        case EACCES: case EPERM: case EROFS: return AUDIO_ERROR_ACCESS_DENIED;
-        case ENOMEM: return AUDIO_ERROR_OUT_OF_MEMORY;
-        default: return AUDIO_ERROR_WRITE;
-    }
-}
-
 // New files get the permissions the process's umask allows; reading it from
 // /proc avoids umask(), which would change it for every thread meanwhile.
 mode_t new_file_mode() {
@@ -120,7 +111,7 @@ public:
         if (rename(temp_.c_str(), target_.c_str()) != 0) {
             int e = errno;
             fail();
-            set_last_error(error_of_errno(e));
+            set_last_error(error_of_errno(e, AUDIO_ERROR_WRITE));
             return false;
         }
         committed_ = true;
@@ -207,7 +198,7 @@ std::unique_ptr<FileWriter> create_at(const std::string &path, const _audio_form
     std::string temp = path.substr(0, name_at) + "." + path.substr(name_at) + ".velmtmp-XXXXXX";
     UniqueFd fd(mkostemp(temp.data(), O_CLOEXEC));
     if (!fd) {
-        set_last_error(error_of_errno(errno));
+        set_last_error(error_of_errno(errno, AUDIO_ERROR_WRITE));
         return nullptr;
     }
     // The saved file keeps the permissions of the one it replaces.
