@@ -135,10 +135,13 @@ typedef struct _audio_file AUDIO_FILE;
 AUDIO_API int  AUDIO_Initialize(void);
 AUDIO_API int  AUDIO_Finalize(void);
 
-/* Format records. */
+/* Format records.  InitFormat leaves the container at AUDIO_CONTAINER_NONE
+ * and picks the coding from the depth: 32 bits are floats, 8 to 24 bits
+ * integers.  NullFormat is all zeros. */
 AUDIO_API _audio_format AUDIO_InitFormat(int sampleRate, int numChannels, int bitsPerSample);
 AUDIO_API _audio_format AUDIO_NullFormat(void);
-/* 1 when the record describes samples that can exist (rate, channels, bits in range). */
+/* 1 when the record describes samples that can exist: rate and channels in
+ * range, bits 0 (unspecified: saved as 16) to 64. */
 AUDIO_API int AUDIO_IsValidFormat(const _audio_format *format);
 /* "sr=44100,nc=2,nbits=16" in a per-thread buffer of 64 bytes valid until the
  * thread's next call; "invalid" for a null or unusable format. */

@@ -265,7 +265,7 @@ AUDIO_API _audio_format AUDIO_NullFormat(void) { return _audio_format{}; }
 
 AUDIO_API int AUDIO_IsValidFormat(const _audio_format *f) {
     return f && f->sampleRate > 0 && f->sampleRate <= AUDIO_MAX_SAMPLE_RATE && f->numChannels > 0 &&
-           f->numChannels <= AUDIO_MAX_CHANNELS && f->bitsPerSample > 0 && f->bitsPerSample <= 64;
+           f->numChannels <= AUDIO_MAX_CHANNELS && f->bitsPerSample >= 0 && f->bitsPerSample <= 64;
 }
 
 AUDIO_API const char *AUDIO_ComposeFormatString(const _audio_format *f) {

@@ -110,6 +110,7 @@ TEST(Save, AutoPicksTheTypeFromTheExtensionAndKeepsFloatSignalsFloat) {
     ASSERT_TRUE(save(dir.file("b.unknown"), pcm_format(8000, 1, 24), "", samples));
     _audio_format floating = AUDIO_InitFormat(8000, 1, 32);  // 32 bits: float samples
     ASSERT_TRUE(save(dir.file("c.wav"), floating, "WAVE", samples));
+    ASSERT_TRUE(save(dir.file("d.flac"), AUDIO_InitFormat(8000, 1, 0), "AUTO", samples));  // depth unspecified
 
     auto a = open_reader(dir.file("a.aif").c_str(), "AUTO");
     auto b = open_reader(dir.file("b.unknown").c_str(), "AUTO");
@@ -120,6 +121,10 @@ TEST(Save, AutoPicksTheTypeFromTheExtensionAndKeepsFloatSignalsFloat) {
     EXPECT_EQ(b->format().audioFormatKind, AUDIO_FORMAT_PCM_24);
     EXPECT_EQ(c->format().audioFormatKind, AUDIO_FORMAT_FLOAT);
     EXPECT_STREQ(c->format_name(), "WAVFLOAT");
+    auto d = open_reader(dir.file("d.flac").c_str(), "AUTO");
+    ASSERT_NE(d, nullptr);
+    EXPECT_EQ(d->format().bitsPerSample, 16);
+    EXPECT_EQ(read_all(*d), samples);
 }
 
 TEST(Save, RefusesWhatTheTypeCannotHoldOrTheTextContradicts) {
