@@ -15,4 +15,3 @@ list(APPEND VELMSIGNAL_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/sndfile_reader.cpp
   ${CMAKE_CURRENT_LIST_DIR}/sndfile_writer.cpp
   ${CMAKE_CURRENT_LIST_DIR}/vfile.cpp)
-
