@@ -177,8 +177,10 @@ std::unique_ptr<FileWriter> create_at(const std::string &path, const _audio_form
     }
     if (f.container == AUDIO_CONTAINER_LINK || (f.container == 0 && exists && is_link_document(path.c_str())))
         return create_through_link(path, format, meta, depth);
-    if ((f.sample_rate && f.sample_rate != format.sampleRate) || (f.channels && f.channels != format.numChannels) ||
-        f.conversion.present) {
+    // Rate and channel keys describe files being read ("AUTO[sr=8000,nc=1]"
+    // becomes "WAVE[sr=8000,nc=1]" once detected); a save always writes the
+    // signal's own rate and channels.
+    if (f.conversion.present) {
         set_last_error(AUDIO_ERROR_BAD_FORMAT_STRING);
         return nullptr;
     }
