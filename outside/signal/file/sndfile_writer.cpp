@@ -2,8 +2,10 @@
 // synced, then renamed over the target, so a failed save leaves the old file
 // as it was and no temporary file behind.
 #include <fcntl.h>
+#include <limits.h>
 #include <sndfile.h>
 #include <strings.h>
+#include <stdlib.h>
 #include <sys/stat.h>
 
 #include <cerrno>
@@ -167,8 +169,11 @@ std::unique_ptr<FileWriter> create_through_link(const std::string &path, const _
     return create_at(target.path, format, tf, meta, depth + 1);
 }
 
-std::unique_ptr<FileWriter> create_at(const std::string &path, const _audio_format &format, const ParsedFormat &f,
+std::unique_ptr<FileWriter> create_at(const std::string &named, const _audio_format &format, const ParsedFormat &f,
                                       const AUDIOMETADATA *meta, int depth) {
+    // Saving over a symbolic link replaces the file it points at, not the link.
+    char real[PATH_MAX];
+    const std::string path = realpath(named.c_str(), real) ? std::string(real) : named;
     struct stat st{};
     bool exists = stat(path.c_str(), &st) == 0;
     if (exists && !S_ISREG(st.st_mode)) {
@@ -203,7 +208,11 @@ std::unique_ptr<FileWriter> create_at(const std::string &path, const _audio_form
         set_last_error(error_of_errno(errno, AUDIO_ERROR_WRITE));
         return nullptr;
     }
-    // The saved file keeps the permissions of the one it replaces.
+    // The saved file keeps the owner and permissions of the one it replaces;
+    // where the process may not give files away, it becomes ours.
+    if (exists) {
+        [[maybe_unused]] int kept_owner = fchown(fd.get(), st.st_uid, st.st_gid);
+    }
     fchmod(fd.get(), exists ? (st.st_mode & 07777) : new_file_mode());
     auto writer = std::make_unique<SndfileWriter>(path, temp, std::move(fd));
     SF_INFO info{};

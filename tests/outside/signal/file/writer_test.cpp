@@ -250,6 +250,21 @@ TEST(Save, ReplacesTheOldFileKeepingItsPermissions) {
     EXPECT_EQ(read_all(*reader), samples);
 }
 
+TEST(Save, ThroughASymbolicLinkReplacesTheFileItNames) {
+    TempDir dir;
+    std::string real = dir.file("real.wav"), link = dir.file("link.wav");
+    ASSERT_TRUE(write_sndfile(real, SF_FORMAT_WAV | SF_FORMAT_PCM_16, 8000, 1, test_signal(1, 10)));
+    ASSERT_EQ(symlink("real.wav", link.c_str()), 0);
+    auto samples = test_signal(1, 700);
+    ASSERT_TRUE(save(link, pcm_format(8000, 1, 16), "WAVE", samples));
+    struct stat st{};
+    ASSERT_EQ(lstat(link.c_str(), &st), 0);
+    EXPECT_TRUE(S_ISLNK(st.st_mode));
+    auto reader = open_reader(real.c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr);
+    EXPECT_EQ(read_all(*reader), samples);
+}
+
 // Which metadata fields each type carries (libsndfile's strings).
 TEST(Save, MetadataSurvivesWhereTheTypeCarriesIt) {
     TempDir dir;
