@@ -128,6 +128,22 @@ typedef struct _audio_format_descr {
     const AUDIO_FORMAT_ENTRY *entries;
 } AUDIO_FORMAT_DESCR;
 
+/* Format strings name a file type and its options: NAME or NAME[key=value,...],
+ * names and keys without regard to case, no spaces.  Names: AUTO (detect on
+ * open; on save, by the file name's extension, else WAVE), WAVE (WAV, WAVPCM),
+ * WAVFLOAT, RF64, W64, AIFF (AIF), AIFFFLOAT, CAF, CAFFLOAT, RAW, RAWFLOAT,
+ * FLAC, OGG (VORBIS), OPUS, MP3, LINK.  Keys:
+ *   sr=rate, nc=channels   headerless files (RAW; AUTO reads a file it does
+ *                          not recognise as headerless when both are given);
+ *                          saves always write the signal's own
+ *   nbits=8|16|24|32|64    stored depth (bps is the same key); 64 with floats
+ *   endian=little|big      headerless files (little unless told)
+ *   offset=bytes           header bytes to skip in a headerless file
+ *   quality=0..1           lossy encoders
+ * A reading conversion may follow: "AUTO:FMTCONV[sr=8000,nc=1,nbits=16]".
+ * Anything else, or a value out of range, is AUDIO_ERROR_BAD_FORMAT_STRING.
+ * Saving WAVE writes RF64 once a file passes 4 GB. */
+
 /* Opaque audio file opened by AUDIO_LoadFile or AUDIO_CreateFileEx. */
 typedef struct _audio_file AUDIO_FILE;
 
