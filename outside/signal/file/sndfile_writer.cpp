@@ -57,11 +57,14 @@ int container_of_extension(const std::string &path) {
 // The coding a save stores: the one the format name fixes, else the bit depth
 // of the format string, else the signal's own.
 int choose_coding(const ParsedFormat &f, const _audio_format &signal, int container, int *bits) {
+    if (f.coding == AUDIO_FORMAT_FLAC) {  // integers of 8, 16 or 24 bits
+        *bits = f.bits ? f.bits : signal.bitsPerSample >= 24 ? 24 : signal.bitsPerSample == 8 ? 8 : 16;
+        return (*bits == 8 || *bits == 16 || *bits == 24) ? f.coding : 0;
+    }
     bool named_float = f.coding == AUDIO_FORMAT_FLOAT;
-    if (f.coding && !named_float) {
-        *bits = f.coding == AUDIO_FORMAT_FLAC ? (f.bits ? f.bits : std::min<int>(signal.bitsPerSample, 24)) : 16;
-        if (f.coding == AUDIO_FORMAT_FLAC && *bits != 8 && *bits != 16 && *bits != 24) *bits = f.bits ? 0 : 16;
-        return *bits ? f.coding : 0;
+    if (f.coding && !named_float) {  // lossy encoders take any depth
+        *bits = 16;
+        return f.coding;
     }
     bool floating = named_float || (!f.bits && (signal.audioFormatKind == AUDIO_FORMAT_FLOAT ||
                                                 signal.audioFormatKind == AUDIO_FORMAT_DOUBLE));
