@@ -39,24 +39,30 @@ mode_t new_file_mode() {
     return 0644;
 }
 
-// The container a name like "song.flac" asks for; WAVE when nothing matches.
-int container_of_extension(const std::string &path) {
+// The format name a file name like "song.flac" asks for: the type listing
+// the extension, and within it the entry the extension names ("opus");
+// WAVE when nothing matches.
+const char *format_name_of_extension(const std::string &path) {
     size_t dot = path.rfind('.'), slash = path.rfind('/');
-    if (dot == std::string::npos || (slash != std::string::npos && dot < slash)) return AUDIO_CONTAINER_WAVE;
+    if (dot == std::string::npos || (slash != std::string::npos && dot < slash)) return "WAVE";
     std::string ext = path.substr(dot + 1);
     for (int i = 0; i < AUDIO_NumFormatDescrs(); ++i) {
         const AUDIO_FORMAT_DESCR *d = AUDIO_GetFormatDescrByIndex(i);
         if (d->containerKind == AUDIO_CONTAINER_LINK) continue;
         std::string list = std::string(d->extensions) + ",";
-        for (size_t at = 0, comma; (comma = list.find(',', at)) != std::string::npos; at = comma + 1)
-            if (strcasecmp(list.substr(at, comma - at).c_str(), ext.c_str()) == 0) return d->containerKind;
+        for (size_t at = 0, comma; (comma = list.find(',', at)) != std::string::npos; at = comma + 1) {
+            if (strcasecmp(list.substr(at, comma - at).c_str(), ext.c_str()) != 0) continue;
+            for (int e = 0; e < d->numEntries; ++e)
+                if (strcasecmp(d->entries[e].name, ext.c_str()) == 0) return d->entries[e].name;
+            return d->entries[0].name;
+        }
     }
-    return AUDIO_CONTAINER_WAVE;
+    return "WAVE";
 }
 
 // The coding a save stores: the one the format name fixes, else the bit depth
 // of the format string, else the signal's own.
-int choose_coding(const ParsedFormat &f, const _audio_format &signal, int container, int *bits) {
+int choose_coding(const ParsedFormat &f, const _audio_format &signal, int *bits) {
     if (f.coding == AUDIO_FORMAT_FLAC) {  // integers of 8, 16 or 24 bits
         *bits = f.bits ? f.bits : signal.bitsPerSample >= 24 ? 24 : signal.bitsPerSample == 8 ? 8 : 16;
         return (*bits == 8 || *bits == 16 || *bits == 24) ? f.coding : 0;
@@ -69,10 +75,10 @@ int choose_coding(const ParsedFormat &f, const _audio_format &signal, int contai
     bool floating = named_float || (!f.bits && (signal.audioFormatKind == AUDIO_FORMAT_FLOAT ||
                                                 signal.audioFormatKind == AUDIO_FORMAT_DOUBLE));
     *bits = f.bits ? f.bits : named_float ? (signal.bitsPerSample == 64 ? 64 : 32) : signal.bitsPerSample;
-    int coding = pcm_coding_for_bits(container, *bits, floating);
+    int coding = pcm_coding_for_bits(f.container, *bits, floating);
     if (!coding && !f.bits && !named_float) {  // a depth the container lacks: 16-bit
         *bits = 16;
-        coding = pcm_coding_for_bits(container, 16, false);
+        coding = pcm_coding_for_bits(f.container, 16, false);
     }
     return coding;
 }
@@ -192,9 +198,15 @@ std::unique_ptr<FileWriter> create_at(const std::string &named, const _audio_for
         set_last_error(AUDIO_ERROR_BAD_FORMAT_STRING);
         return nullptr;
     }
-    int container = f.container ? f.container : container_of_extension(path);
+    ParsedFormat chosen = f;
+    if (!f.container) {
+        const FormatName *name = find_format_name(format_name_of_extension(path));
+        chosen.container = name->container;
+        chosen.coding = name->coding;
+    }
+    int container = chosen.container;
     int bits = 0;
-    int coding = choose_coding(f, format, container, &bits);
+    int coding = choose_coding(chosen, format, &bits);
     bool wave = container == AUDIO_CONTAINER_WAVE;
     int sf = coding ? sf_format_of(wave ? AUDIO_CONTAINER_RF64 : container, coding, bits) : 0;
     if (!sf) {

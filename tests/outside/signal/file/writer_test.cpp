@@ -117,6 +117,8 @@ TEST(Save, AutoPicksTheTypeFromTheExtensionAndKeepsFloatSignalsFloat) {
     _audio_format floating = AUDIO_InitFormat(8000, 1, 32);  // 32 bits: float samples
     ASSERT_TRUE(save(dir.file("c.wav"), floating, "WAVE", samples));
     ASSERT_TRUE(save(dir.file("d.flac"), AUDIO_InitFormat(8000, 1, 0), "AUTO", samples));  // depth unspecified
+    ASSERT_TRUE(save(dir.file("e.flac"), floating, "AUTO", samples));  // floats: FLAC's deepest
+    ASSERT_TRUE(save(dir.file("f.opus"), pcm_format(48000, 1, 16), "AUTO", test_signal(1, 4800)));
 
     auto a = open_reader(dir.file("a.aif").c_str(), "AUTO");
     auto b = open_reader(dir.file("b.unknown").c_str(), "AUTO");
@@ -131,6 +133,12 @@ TEST(Save, AutoPicksTheTypeFromTheExtensionAndKeepsFloatSignalsFloat) {
     ASSERT_NE(d, nullptr);
     EXPECT_EQ(d->format().bitsPerSample, 16);
     EXPECT_EQ(read_all(*d), samples);
+    auto e = open_reader(dir.file("e.flac").c_str(), "AUTO");
+    ASSERT_NE(e, nullptr);
+    EXPECT_EQ(e->format().bitsPerSample, 24);
+    auto opus = open_reader(dir.file("f.opus").c_str(), "AUTO");
+    ASSERT_NE(opus, nullptr);
+    EXPECT_EQ(opus->format().audioFormatKind, AUDIO_FORMAT_OPUS);
 }
 
 // A document opened with "AUTO[sr=8000,nc=1]" keeps that text with the
