@@ -1,11 +1,12 @@
 #include "outside/signal/file/sndfile_reader_internal.hpp"
 
+#include <fcntl.h>
 #include <sndfile.h>
 
 #include <algorithm>
 #include <cstring>
-#include <vector>
 #include <mutex>
+#include <vector>
 
 #include "outside/signal/file/direct_pcm_internal.hpp"
 #include "outside/signal/file/formats_internal.hpp"
@@ -178,7 +179,7 @@ std::unique_ptr<FileReader> open_sndfile_reader(UniqueFd fd, int64_t size, const
     // "AUTO[sr=..,nc=..]": a file no header describes is read as headerless.
     if (error == AUDIO_ERROR_UNSUPPORTED_FORMAT && format.container == 0 && format.sample_rate && format.channels &&
         raw_info(format, &info)) {
-        UniqueFd again(dup(fd_number));
+        UniqueFd again(fcntl(fd_number, F_DUPFD_CLOEXEC, 0));
         if (!again) {
             set_last_error(AUDIO_ERROR_READ);
             return nullptr;
