@@ -144,6 +144,8 @@ private:
         auto direct = std::make_unique<DirectPcm>(fd_.get(), vfile_.file_offset(), format_.audioFormatKind,
                                                   format_.numChannels);
         if (second - vfile_.file_offset() != direct->bytes_per_frame()) return;
+        // Now the length is known exactly: the frames after the first one.
+        frames_ = std::min(frames_, (vfile_.file_size() - vfile_.file_offset()) / direct->bytes_per_frame());
         int64_t n = std::min<int64_t>(frames_, 1024);
         std::vector<float> theirs(static_cast<size_t>(n * format_.numChannels)), ours(theirs.size());
         if (sf_readf_float(sf_, theirs.data(), n) != n || direct->read(0, ours.data(), n) != n) return;
