@@ -1,5 +1,9 @@
 #include "outside/signal/store/chunk.hpp"
 
+#ifdef __SSE2__
+#include <immintrin.h>
+#endif
+
 #include <algorithm>
 #include <atomic>
 #include <cstring>
@@ -109,11 +113,49 @@ ChunkPtr store_in_block_file(const float *samples, int64_t count, std::vector<Mi
 MinMax scan_minmax(const float *samples, int64_t count)
 {
     float lo = __builtin_inff(), hi = -__builtin_inff();
-    for (int64_t i = 0; i < count; ++i) {
+    int64_t i = 0;
+#ifdef __SSE2__
+    __m128 vlo = _mm_set1_ps(lo), vhi = _mm_set1_ps(hi);
+    for (; i + 4 <= count; i += 4) {
+        const __m128 x = _mm_loadu_ps(samples + i);
+        vlo = _mm_min_ps(vlo, x);
+        vhi = _mm_max_ps(vhi, x);
+    }
+    alignas(16) float l[4], h[4];
+    _mm_store_ps(l, vlo);
+    _mm_store_ps(h, vhi);
+    for (int k = 0; k < 4; ++k) {
+        lo = std::min(lo, l[k]);
+        hi = std::max(hi, h[k]);
+    }
+#endif
+    for (; i < count; ++i) {
         lo = std::min(lo, samples[i]);
         hi = std::max(hi, samples[i]);
     }
     return {lo, hi};
+}
+
+MinMax merge_minmax(const MinMax *entries, int64_t count)
+{
+    MinMax result = MinMax::empty();
+    int64_t i = 0;
+#ifdef __SSE2__
+    // Two entries per register: lanes 0 and 2 hold minima, 1 and 3 maxima.
+    __m128 vlo = _mm_set1_ps(result.min), vhi = _mm_set1_ps(result.max);
+    static_assert(sizeof(MinMax) == 2 * sizeof(float), "entries are float pairs");
+    for (; i + 2 <= count; i += 2) {
+        const __m128 x = _mm_loadu_ps(&entries[i].min);
+        vlo = _mm_min_ps(vlo, x);
+        vhi = _mm_max_ps(vhi, x);
+    }
+    alignas(16) float l[4], h[4];
+    _mm_store_ps(l, vlo);
+    _mm_store_ps(h, vhi);
+    result = {std::min(l[0], l[2]), std::max(h[1], h[3])};
+#endif
+    for (; i < count; ++i) result.add(entries[i]);
+    return result;
 }
 
 std::vector<MinMax> summarize(const float *samples, int64_t count)
@@ -170,7 +212,7 @@ MinMax Chunk::minmax(int64_t a, int64_t b, WindowCache &cache) const
     if (first >= last) return raw_minmax(a, b, cache);
     MinMax result = MinMax::empty();
     if (a < first * kWindowFrames) result.add(raw_minmax(a, first * kWindowFrames, cache));
-    for (int64_t w = first; w < last; ++w) result.add(windows_[size_t(w)]);
+    result.add(merge_minmax(windows_.data() + first, last - first));
     if (last * kWindowFrames < b) result.add(raw_minmax(last * kWindowFrames, b, cache));
     return result;
 }

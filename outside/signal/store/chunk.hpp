@@ -25,6 +25,8 @@ struct MinMax {
 };
 
 MinMax scan_minmax(const float *samples, int64_t count);
+// The union of count summary entries.
+MinMax merge_minmax(const MinMax *entries, int64_t count);
 
 // The raw samples of one window, kept by a reader that scans forward so that
 // the window shared by two consecutive ranges is fetched once.
