@@ -10,8 +10,11 @@ namespace velmsig {
 
 class SampleSource;
 
-// Largest chunk, and the frames summarised by one window entry.
+// Largest chunk of new samples, largest chunk of a file read in place (it
+// holds no samples, so fewer, longer ones keep block lists short), and the
+// frames summarised by one window entry.
 constexpr int64_t kChunkFrames = 65536;
+constexpr int64_t kSourceChunkFrames = 1 << 20;
 constexpr int64_t kWindowFrames = 256;
 
 struct MinMax {

@@ -89,15 +89,15 @@ std::vector<std::vector<MinMax>> summarize_frames(const float *frames, int64_t n
 bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<SegmentsPtr> &result)
 {
     const int channels = source->channels();
-    const int64_t pieces = (source->frames() + kChunkFrames - 1) / kChunkFrames;
+    const int64_t pieces = (source->frames() + kSourceChunkFrames - 1) / kSourceChunkFrames;
     std::vector<std::vector<ChunkPtr>> chunks(static_cast<size_t>(channels),
                                              std::vector<ChunkPtr>(static_cast<size_t>(pieces)));
     std::atomic<int64_t> next{0};
     std::atomic<bool> failed{false};
     auto work = [&] {
-        std::vector<float> frames(size_t(kChunkFrames) * size_t(channels));
+        std::vector<float> frames(size_t(kSourceChunkFrames) * size_t(channels));
         for (int64_t k = next++; k < pieces && !failed; k = next++) {
-            const int64_t at = k * kChunkFrames, n = std::min(kChunkFrames, source->frames() - at);
+            const int64_t at = k * kSourceChunkFrames, n = std::min(kSourceChunkFrames, source->frames() - at);
             if (source->read(at, frames.data(), n) != n) {
                 failed = true;
                 return;
