@@ -110,30 +110,35 @@ ChunkPtr store_in_block_file(const float *samples, int64_t count, std::vector<Mi
 
 }  // namespace
 
-MinMax scan_minmax(const float *samples, int64_t count)
+void scan_frames(const float *frames, int64_t count, int channels, MinMax *out)
 {
-    float lo = __builtin_inff(), hi = -__builtin_inff();
+    for (int c = 0; c < channels; ++c) out[c] = MinMax::empty();
     int64_t i = 0;
 #ifdef __SSE2__
-    __m128 vlo = _mm_set1_ps(lo), vhi = _mm_set1_ps(hi);
-    for (; i + 4 <= count; i += 4) {
-        const __m128 x = _mm_loadu_ps(samples + i);
-        vlo = _mm_min_ps(vlo, x);
-        vhi = _mm_max_ps(vhi, x);
-    }
-    alignas(16) float l[4], h[4];
-    _mm_store_ps(l, vlo);
-    _mm_store_ps(h, vhi);
-    for (int k = 0; k < 4; ++k) {
-        lo = std::min(lo, l[k]);
-        hi = std::max(hi, h[k]);
+    // With 1, 2 or 4 channels every lane of four samples stays on one channel.
+    if (4 % channels == 0) {
+        __m128 vlo = _mm_set1_ps(__builtin_inff()), vhi = _mm_set1_ps(-__builtin_inff());
+        for (; (i + 4 / channels) <= count; i += 4 / channels) {
+            const __m128 x = _mm_loadu_ps(frames + i * channels);
+            vlo = _mm_min_ps(vlo, x);
+            vhi = _mm_max_ps(vhi, x);
+        }
+        alignas(16) float l[4], h[4];
+        _mm_store_ps(l, vlo);
+        _mm_store_ps(h, vhi);
+        for (int k = 0; k < 4; ++k) out[k % channels].add({l[k], h[k]});
     }
 #endif
     for (; i < count; ++i) {
-        lo = std::min(lo, samples[i]);
-        hi = std::max(hi, samples[i]);
+        for (int c = 0; c < channels; ++c) out[c].add({frames[i * channels + c], frames[i * channels + c]});
     }
-    return {lo, hi};
+}
+
+MinMax scan_minmax(const float *samples, int64_t count)
+{
+    MinMax result;
+    scan_frames(samples, count, 1, &result);
+    return result;
 }
 
 MinMax merge_minmax(const MinMax *entries, int64_t count)

@@ -28,6 +28,8 @@ struct MinMax {
 };
 
 MinMax scan_minmax(const float *samples, int64_t count);
+// Extremes of each channel of count interleaved frames into out[channel].
+void scan_frames(const float *frames, int64_t count, int channels, MinMax *out);
 // The union of count summary entries.
 MinMax merge_minmax(const MinMax *entries, int64_t count);
 
