@@ -24,6 +24,7 @@ std::string_view Trim(std::string_view text);
 
 /* Released by the last BLCORE_Finalize, after the registered objects are disposed. */
 void ResetNotifications();
+void ResetSettings();
 void ResetVersions();
 void DisposeRegisteredObjects();
 

@@ -6,6 +6,8 @@
  * Every call accepts null handles and answers with its failure value
  * (0, null or -1) instead of crashing.  Unless a call says otherwise, texts
  * handed in are copied and texts handed out stay owned by the library.
+ * printf-style formats also accept the 64-bit size prefix "I64" ("%I64d"),
+ * read as "ll".
  */
 #ifndef BLBASE_H
 #define BLBASE_H
@@ -72,36 +74,66 @@ BL_API void   *BLMEM_OverlapMemCopy(void *dst, const void *src, size_t size);
 /* ---- Settings --------------------------------------------------------- */
 
 /* A null BLSETTINGS is the process-wide registry.  Keys are dotted names,
- * compared without regard to case; every key text is printf-style. */
+ * compared without regard to case; every key text is printf-style.  A key
+ * holds a value (set by the user) and a default (registered by the program);
+ * reads prefer the value.  Keys may not contain '[', ']', '=' or control
+ * characters, and a dotted part may not start or end with a space.
+ *
+ * Ini files: a key's first dotted part is its section, the rest its name, so
+ * "libvelm.draw.hovertime=500" is written as "draw.hovertime=500" under
+ * "[libvelm]"; keys without a dot come first, before any section.  Lines
+ * starting with ';' or '#' are comments.  In values a backslash, the line
+ * breaks and a leading '{' are written as \\, \n, \r and \{; secret values
+ * are written obscured as "{obscured}" and hex digits.  Only values are
+ * written, never defaults. */
 typedef struct BLSettings *BLSETTINGS;
+
+/* Larger ini files are refused rather than read. */
+#define BLSETTINGS_MAX_FILE_SIZE (16 * 1024 * 1024)
 
 BL_API BLSETTINGS BLSETTINGS_Create(void);
 BL_API int        BLSETTINGS_Destroy(BLSETTINGS settings);
 /* Puts a settings object in front of the process-wide registry in the lookup
- * chain of every read through the null handle; Remove takes it out again. */
+ * chain of every read through the null handle (the last inserted first;
+ * inserting again brings it to the front); Remove takes it out again.  Both
+ * count as a change of the process-wide registry. */
 BL_API int        BLSETTINGS_Insert(BLSETTINGS settings);
 BL_API int        BLSETTINGS_Remove(BLSETTINGS settings);
 /* Backs a settings object with a file ("ini" is the only kind).  Values in
- * the file are loaded at once; every later change is written back. */
+ * the file are loaded at once (over values already held); every later
+ * change of a value rewrites the file through a temporary file and a rename,
+ * so the file is never left cut.  Reading never rewrites the file.  Lines
+ * that cannot be read are skipped and reported through the log; the next
+ * write then keeps the old file as path + ".bak".  A missing file is created
+ * at the first change.  Answers 0 for an unreadable or oversized file. */
 BL_API int        BLSETTINGS_SetConfigFileEx(BLSETTINGS settings, const char *path, const char *kind);
 
-/* "key=value": sets a value.  Returns 1, or 0 for a malformed text. */
+/* "key=value": sets a value.  Returns 1 when the value changed, 0 when it
+ * already was that value or the text is malformed. */
 BL_API int BLSETTINGS_ChangeEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 /* The same, kept obscured in files. */
 BL_API int BLSETTINGS_ChangeSecretEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
-/* "key=value": sets the default; a value the user set is never overridden. */
+/* "key=value": sets the default; a value the user set is never overridden.
+ * Returns 1, or 0 for a malformed text. */
 BL_API int BLSETTINGS_SetDefaultEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 /* 1 when the key has a value or a default in this object (not the chain). */
 BL_API int BLSETTINGS_ExistsEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
-/* Removes a key's value (its default stays). */
+/* Removes a key's value (its default stays); 0 when it had none. */
 BL_API int BLSETTINGS_DeleteEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 
 /* Reads "key" or "key=[default]": the value, else the default given in
- * brackets, else the registered default, else 0 / false / "". */
+ * brackets, else the registered default, else 0 / false / "".  Through the
+ * null handle the inserted objects are asked before the process-wide
+ * registry, for values and then for defaults.  A text that does not read as
+ * the wanted type gives way to the next one.  Numbers are read without
+ * regard to the locale ("0x" hex words too); Bool accepts 1/0, true/false,
+ * yes/no and on/off. */
 BL_API int         BLSETTINGS_GetIntEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 BL_API double      BLSETTINGS_GetFloatEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 BL_API int         BLSETTINGS_GetBoolEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
-/* Returned texts are interned: they stay valid until BLCORE_Finalize. */
+/* Returned texts are interned: they stay valid until BLCORE_Finalize.  A
+ * secret value reads in its obscured form here and plain through
+ * GetSecretStringEx. */
 BL_API const char *BLSETTINGS_GetStringEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 BL_API const char *BLSETTINGS_GetSecretStringEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 /* Grows on every change; for the null handle, on every change of the
@@ -193,6 +225,9 @@ BL_API int     MutexDestroy(BLMUTEX mutex);
 
 /* ---- Lists ------------------------------------------------------------ */
 
+/* An ordered list of non-null pointers, used by one thread at a time.
+ * DLList_Next answers null at the end; an iterator survives changes of its
+ * list (it walks by position). */
 typedef struct DLList DLList;
 typedef struct DLListIterator { const DLList *list; size_t index; } DLListIterator;
 
@@ -200,6 +235,7 @@ BL_API DLList *DLList_Create(void);
 BL_API int     DLList_Destroy(DLList *list);
 BL_API int     DLList_Append(DLList *list, void *item);
 BL_API int     DLList_Insert(DLList *list, size_t index, void *item);
+/* Removes the first occurrence. */
 BL_API int     DLList_Remove(DLList *list, void *item);
 BL_API size_t  DLList_Count(const DLList *list);
 BL_API void   *DLList_Get(const DLList *list, size_t index);
@@ -217,10 +253,20 @@ BL_API int     BLIO_GetHFileKind(const char *name);
  * nanoseconds since the epoch; 0 when the file is missing. */
 BL_API uint64_t BLUTIL_GetFileTime(const char *name, int kind);
 
-/* Text forms "[a,b,c]" and "[[a,b],[c,d]]" (row by row); -1 when the buffer is too small. */
+/* Times and stamps are nanoseconds since the epoch (UTC): the current time,
+ * and a time as a stamp.  Stamps keep the unit of times, so a stamp made from
+ * a file time equals that file time read again while the file is unchanged. */
+BL_API uint64_t BLgetgmtime(void);
+BL_API uint64_t BLtimeToBLtimeStamp(uint64_t time);
+
+/* Text forms "[a,b,c]" and "[[a,b],[c,d]]" (row by row), numbers in their
+ * shortest exact form whatever the locale.  Return the text's length, or -1
+ * when the buffer is too small (it then holds ""). */
 BL_API int BLSTRING_SetDoubleVectorToString(const double *values, int count, char *buffer, int size);
 BL_API int BLSTRING_SetDoubleMatrixToString(const double *values, int rows, int columns, char *buffer, int size);
-/* Parse the same forms; return the number of values read, -1 on malformed text. */
+/* Parse the same forms (spaces allowed); return the number of values read,
+ * -1 on malformed text, ragged rows or more values than capacity.  With null
+ * values they only count. */
 BL_API int BLSTRING_GetDoubleVectorFromString(const char *text, double *values, int capacity);
 BL_API int BLSTRING_GetDoubleMatrixFromString(const char *text, double *values, int capacity, int *rows, int *columns);
 

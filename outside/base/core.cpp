@@ -50,6 +50,7 @@ void BLCORE_Finalize(void)
     // Objects go first: their disposers may still read settings or send events.
     blbase::DisposeRegisteredObjects();
     blbase::ResetNotifications();
+    blbase::ResetSettings();
     blbase::ResetVersions();
     blbase::ClearInternedTexts();
 }

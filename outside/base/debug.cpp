@@ -68,36 +68,31 @@ void CloseFile(LogState &log)
 
 } // namespace
 
+// Hands a printf-style call's arguments to Emit.
+#define BL_EMIT(kind, level, format)                                                               \
+    va_list args;                                                                                  \
+    va_start(args, format);                                                                        \
+    Emit(kind, level, format, args);                                                               \
+    va_end(args)
+
 void BLDEBUG_Log(int level, const char *format, ...)
 {
-    va_list args;
-    va_start(args, format);
-    Emit(BLDEBUG_KIND_LOG, level, format, args);
-    va_end(args);
+    BL_EMIT(BLDEBUG_KIND_LOG, level, format);
 }
 
 void BLDEBUG_Warning(int code, const char *format, ...)
 {
-    va_list args;
-    va_start(args, format);
-    Emit(BLDEBUG_KIND_WARNING, BLDEBUG_LEVEL_ERROR, format, args);
-    va_end(args);
+    BL_EMIT(BLDEBUG_KIND_WARNING, BLDEBUG_LEVEL_ERROR, format);
 }
 
 void BLDEBUG_Error(int code, const char *format, ...)
 {
-    va_list args;
-    va_start(args, format);
-    Emit(BLDEBUG_KIND_ERROR, BLDEBUG_LEVEL_ERROR, format, args);
-    va_end(args);
+    BL_EMIT(BLDEBUG_KIND_ERROR, BLDEBUG_LEVEL_ERROR, format);
 }
 
 void BLDEBUG_TerminalError(int code, const char *format, ...)
 {
-    va_list args;
-    va_start(args, format);
-    Emit(BLDEBUG_KIND_TERMINAL, BLDEBUG_LEVEL_ERROR, format, args);
-    va_end(args);
+    BL_EMIT(BLDEBUG_KIND_TERMINAL, BLDEBUG_LEVEL_ERROR, format);
 }
 
 void BLDEBUG_SetLevel(int level)

@@ -74,6 +74,18 @@ int RemoveFrom(HandlerList &list, BLNOTIFY_Handler function, void *user)
     return 1;
 }
 
+// Applies change to the default handlers or to a dispatcher's handlers.
+int ChangeHandlers(BLNOTIFY dispatcher, bool defaults, BLNOTIFY_Handler handler, void *user,
+                   int (*change)(HandlerList &, BLNOTIFY_Handler, void *))
+{
+    if (!handler) return 0;
+    NotifyState &state = State();
+    std::lock_guard guard(state.lock);
+    if (defaults) return change(state.defaults, handler, user);
+    BLNotifyDispatcher *target = Resolve(state, dispatcher);
+    return target ? change(target->handlers, handler, user) : 0;
+}
+
 void RemoveAll(HandlerList &list)
 {
     for (auto &h : list) h->removed = true;
@@ -117,34 +129,22 @@ int BLNOTIFY_DestroyDispatcher(BLNOTIFY dispatcher)
 
 int BLNOTIFY_AddHandler(BLNOTIFY dispatcher, BLNOTIFY_Handler handler, void *user)
 {
-    if (!handler) return 0;
-    NotifyState &state = State();
-    std::lock_guard guard(state.lock);
-    BLNotifyDispatcher *target = Resolve(state, dispatcher);
-    return target ? AddTo(target->handlers, handler, user) : 0;
+    return ChangeHandlers(dispatcher, false, handler, user, AddTo);
 }
 
 int BLNOTIFY_DelHandler(BLNOTIFY dispatcher, BLNOTIFY_Handler handler, void *user)
 {
-    if (!handler) return 0;
-    NotifyState &state = State();
-    std::lock_guard guard(state.lock);
-    BLNotifyDispatcher *target = Resolve(state, dispatcher);
-    return target ? RemoveFrom(target->handlers, handler, user) : 0;
+    return ChangeHandlers(dispatcher, false, handler, user, RemoveFrom);
 }
 
 int BLNOTIFY_AddDefaultHandler(BLNOTIFY_Handler handler, void *user)
 {
-    if (!handler) return 0;
-    std::lock_guard guard(State().lock);
-    return AddTo(State().defaults, handler, user);
+    return ChangeHandlers(nullptr, true, handler, user, AddTo);
 }
 
 int BLNOTIFY_DelDefaultHandler(BLNOTIFY_Handler handler, void *user)
 {
-    if (!handler) return 0;
-    std::lock_guard guard(State().lock);
-    return RemoveFrom(State().defaults, handler, user);
+    return ChangeHandlers(nullptr, true, handler, user, RemoveFrom);
 }
 
 int BLNOTIFY_SendEvent(BLNOTIFY dispatcher, void *sender, int flags, uint32_t event, void *data1,

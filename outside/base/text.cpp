@@ -3,14 +3,46 @@
 #include <algorithm>
 #include <cctype>
 #include <cstdio>
+#include <cstring>
+#include <optional>
 #include <mutex>
 #include <unordered_set>
 
 namespace blbase {
 
+namespace {
+
+// The 64-bit size prefix "I64" of some platforms ("%I64d") means "ll" here;
+// returns the format with it translated, or null when there is none.
+std::optional<std::string> Portable(const char *format)
+{
+    if (!std::strstr(format, "I64")) return std::nullopt;
+    std::string out;
+    for (const char *p = format; *p; ++p) {
+        out += *p;
+        if (*p != '%') continue;
+        if (p[1] == '%') {
+            out += *++p;
+            continue;
+        }
+        const size_t spec = std::strspn(p + 1, "-+ #0123456789.*");
+        out.append(p + 1, spec);
+        p += spec;
+        if (std::strncmp(p + 1, "I64", 3) == 0) {
+            out += "ll";
+            p += 3;
+        }
+    }
+    return out;
+}
+
+} // namespace
+
 bool FormatText(std::string &out, const char *format, va_list args)
 {
     if (!format) return false;
+    const std::optional<std::string> portable = Portable(format);
+    if (portable) format = portable->c_str();
     va_list copy;
     va_copy(copy, args);
     char small[256];

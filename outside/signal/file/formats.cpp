@@ -1,11 +1,12 @@
 // Format names, descriptors, labels and format filter masks.
 #include "outside/signal/file/formats_internal.hpp"
 
+#include <sndfile.h>
 #include <strings.h>
 
 #include <cmath>
 #include <cstdio>
-#include <iterator>
+#include <vector>
 
 #include "outside/signal/audioformat.h"
 
@@ -42,7 +43,7 @@ constexpr uint32_t kAllBits = kAllIntBits | AUDIO_FILTER_FLOAT | AUDIO_FILTER_DO
 constexpr uint32_t kPcmFile = AUDIO_FILTER_ANY_RATE | kAllChannels | kAllBits | AUDIO_DESCR_READ |
                               AUDIO_DESCR_WRITE | AUDIO_DESCR_RANDOM_ACCESS;
 // Lossy codings store any bit depth: the samples are re-encoded anyway.
-constexpr uint32_t kLossy = kAllBits | AUDIO_DESCR_READ | AUDIO_DESCR_WRITE | AUDIO_DESCR_LOSSY;
+constexpr uint32_t kLossy = kAllBits | AUDIO_DESCR_READ | AUDIO_DESCR_LOSSY;
 
 constexpr AUDIO_FORMAT_ENTRY kWaveEntries[] = {
     {"WAVE", "PCM 16-bit", AUDIO_FORMAT_PCM_16, 16},
@@ -116,30 +117,48 @@ constexpr AUDIO_FORMAT_DESCR descr(const char *name, const char *label, const ch
     return {name, label, ext, static_cast<uint16_t>(container), flags, static_cast<int>(N), entries};
 }
 
+// Whether the installed libsndfile encodes a lossy coding is known at run
+// time only.
+uint32_t write_flag_if_encodes(int sf_format) {
+    SF_INFO info{};
+    info.samplerate = 48000;
+    info.channels = 2;
+    info.format = sf_format;
+    return sf_format_check(&info) ? AUDIO_DESCR_WRITE : 0;
+}
+
 // FLAC holds 8 channels of up to 24-bit integers; MP3 and Opus at most two
 // channels at their own rates.  Opus also encodes 12000 and 24000 Hz, which
 // fall under "other rates".
-const AUDIO_FORMAT_DESCR kDescrs[] = {
-    descr("WAVE", "Microsoft WAVE", "wav", AUDIO_CONTAINER_WAVE, kPcmFile, kWaveEntries),
-    descr("RF64", "RF64 WAVE", "rf64,wav", AUDIO_CONTAINER_RF64, kPcmFile, kRf64Entries),
-    descr("W64", "Sony Wave64", "w64", AUDIO_CONTAINER_W64, kPcmFile, kW64Entries),
-    descr("AIFF", "Apple AIFF", "aif,aiff,aifc", AUDIO_CONTAINER_AIFF, kPcmFile, kAiffEntries),
-    descr("CAF", "Apple Core Audio", "caf", AUDIO_CONTAINER_CAF, kPcmFile, kCafEntries),
-    descr("RAW", "Headerless", "raw,pcm", AUDIO_CONTAINER_RAW, kPcmFile, kRawEntries),
-    descr("FLAC", "FLAC", "flac", AUDIO_CONTAINER_FLAC,
-          AUDIO_FILTER_ANY_RATE | kAllChannels | AUDIO_FILTER_8BIT | AUDIO_FILTER_16BIT | AUDIO_FILTER_24BIT |
-              AUDIO_DESCR_READ | AUDIO_DESCR_WRITE,
-          kFlacEntries),
-    descr("OGG", "Ogg", "ogg,oga,opus", AUDIO_CONTAINER_OGG, AUDIO_FILTER_ANY_RATE | kAllChannels | kLossy,
-          kOggEntries),
-    descr("MP3", "MPEG Audio", "mp3", AUDIO_CONTAINER_MPEG,
-          AUDIO_FILTER_RATE_48000 | AUDIO_FILTER_RATE_44100 | AUDIO_FILTER_RATE_32000 | AUDIO_FILTER_RATE_22050 |
-              AUDIO_FILTER_RATE_16000 | AUDIO_FILTER_RATE_11025 | AUDIO_FILTER_RATE_8000 | AUDIO_FILTER_MONO |
-              AUDIO_FILTER_STEREO | kLossy,
-          kMpegEntries),
-    descr("LINK", "Link document", "velmlink,ini", AUDIO_CONTAINER_LINK,
-          AUDIO_FILTER_ALL | AUDIO_DESCR_READ | AUDIO_DESCR_WRITE, kLinkEntries),
-};
+std::vector<AUDIO_FORMAT_DESCR> make_descrs() {
+    return {
+        descr("WAVE", "Microsoft WAVE", "wav", AUDIO_CONTAINER_WAVE, kPcmFile, kWaveEntries),
+        descr("RF64", "RF64 WAVE", "rf64", AUDIO_CONTAINER_RF64, kPcmFile, kRf64Entries),
+        descr("W64", "Sony Wave64", "w64", AUDIO_CONTAINER_W64, kPcmFile, kW64Entries),
+        descr("AIFF", "Apple AIFF", "aif,aiff,aifc", AUDIO_CONTAINER_AIFF, kPcmFile, kAiffEntries),
+        descr("CAF", "Apple Core Audio", "caf", AUDIO_CONTAINER_CAF, kPcmFile, kCafEntries),
+        descr("RAW", "Headerless", "raw,pcm", AUDIO_CONTAINER_RAW, kPcmFile, kRawEntries),
+        descr("FLAC", "FLAC", "flac", AUDIO_CONTAINER_FLAC,
+              AUDIO_FILTER_ANY_RATE | kAllChannels | AUDIO_FILTER_8BIT | AUDIO_FILTER_16BIT | AUDIO_FILTER_24BIT |
+                  AUDIO_DESCR_READ | AUDIO_DESCR_WRITE,
+              kFlacEntries),
+        descr("OGG", "Ogg", "ogg,oga,opus", AUDIO_CONTAINER_OGG,
+              AUDIO_FILTER_ANY_RATE | kAllChannels | kLossy | write_flag_if_encodes(SF_FORMAT_OGG | SF_FORMAT_VORBIS),
+              kOggEntries),
+        descr("MP3", "MPEG Audio", "mp3", AUDIO_CONTAINER_MPEG,
+              AUDIO_FILTER_RATE_48000 | AUDIO_FILTER_RATE_44100 | AUDIO_FILTER_RATE_32000 | AUDIO_FILTER_RATE_22050 |
+                  AUDIO_FILTER_RATE_16000 | AUDIO_FILTER_RATE_11025 | AUDIO_FILTER_RATE_8000 | AUDIO_FILTER_MONO |
+                  AUDIO_FILTER_STEREO | kLossy | write_flag_if_encodes(SF_FORMAT_MPEG | SF_FORMAT_MPEG_LAYER_III),
+              kMpegEntries),
+        descr("LINK", "Link document", "velmlink", AUDIO_CONTAINER_LINK,
+              AUDIO_FILTER_ALL | AUDIO_DESCR_READ | AUDIO_DESCR_WRITE, kLinkEntries),
+    };
+}
+
+const std::vector<AUDIO_FORMAT_DESCR> &descrs() {
+    static const std::vector<AUDIO_FORMAT_DESCR> table = make_descrs();
+    return table;
+}
 
 struct RateBit {
     int rate;
@@ -152,7 +171,7 @@ constexpr RateBit kRateBits[] = {
 };
 
 const AUDIO_FORMAT_DESCR *descr_of_container(int container) {
-    for (const auto &d : kDescrs)
+    for (const auto &d : descrs())
         if (d.containerKind == container) return &d;
     return nullptr;
 }
@@ -280,10 +299,10 @@ AUDIO_API const AUDIO_FORMAT_DESCR *AUDIO_GetFormatDescrByName(const char *name,
     return d;
 }
 
-AUDIO_API int AUDIO_NumFormatDescrs(void) { return static_cast<int>(std::size(kDescrs)); }
+AUDIO_API int AUDIO_NumFormatDescrs(void) { return static_cast<int>(descrs().size()); }
 
 AUDIO_API const AUDIO_FORMAT_DESCR *AUDIO_GetFormatDescrByIndex(int i) {
-    return (i >= 0 && i < AUDIO_NumFormatDescrs()) ? &kDescrs[i] : nullptr;
+    return (i >= 0 && i < AUDIO_NumFormatDescrs()) ? &descrs()[static_cast<size_t>(i)] : nullptr;
 }
 
 AUDIO_API uint32_t AUDIO_FormatFilterMaskFromAudioFormat(const _audio_format *f) {

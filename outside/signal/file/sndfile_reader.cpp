@@ -3,8 +3,11 @@
 #include <sndfile.h>
 
 #include <algorithm>
+#include <cstring>
+#include <vector>
 #include <mutex>
 
+#include "outside/signal/file/direct_pcm_internal.hpp"
 #include "outside/signal/file/formats_internal.hpp"
 #include "outside/signal/file/lasterror_internal.hpp"
 #include "outside/signal/file/metadata_internal.hpp"
@@ -80,6 +83,10 @@ public:
                                    : (size > INT64_MAX / kMaxFramesPerByte ? INT64_MAX : size * kMaxFramesPerByte);
         frames_ = std::min<int64_t>(info.frames, capacity);
         meta_ = metadata_from_sndfile(sf_);
+        if (random_ && (info.format & SF_FORMAT_ENDMASK) != SF_ENDIAN_BIG && DirectPcm::handles(coding) &&
+            (container == AUDIO_CONTAINER_WAVE || container == AUDIO_CONTAINER_RF64 ||
+             container == AUDIO_CONTAINER_W64 || container == AUDIO_CONTAINER_RAW))
+            enable_direct_reads();
         return AUDIO_ERROR_NONE;
     }
 
@@ -94,12 +101,17 @@ public:
             set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
             return -1;
         }
-        std::lock_guard lock(mutex_);
         if (random_) {
             if (first >= frames_) return 0;
             count = std::min(count, frames_ - first);
         }
         if (count == 0) return 0;
+        if (direct_) {
+            int64_t n = direct_->read(first, out, count);
+            if (n < 0) set_last_error(AUDIO_ERROR_READ);
+            return n;
+        }
+        std::lock_guard lock(mutex_);
         if (first != next_) {
             if (sf_seek(sf_, first, SEEK_SET) != first) {
                 // Past the real end of a compressed stream: nothing to read.
@@ -120,6 +132,24 @@ public:
     }
 
 private:
+    // Where the samples start is where libsndfile seeks for frame 0; the
+    // first frames must then read the same both ways before the direct path
+    // is trusted.
+    void enable_direct_reads() {
+        if (sf_seek(sf_, 1, SEEK_SET) != 1) return;
+        int64_t second = vfile_.file_offset();
+        if (sf_seek(sf_, 0, SEEK_SET) != 0) return;
+        next_ = 0;
+        auto direct = std::make_unique<DirectPcm>(fd_.get(), vfile_.file_offset(), format_.audioFormatKind,
+                                                  format_.numChannels);
+        if (second - vfile_.file_offset() != direct->bytes_per_frame()) return;
+        int64_t n = std::min<int64_t>(frames_, 1024);
+        std::vector<float> theirs(static_cast<size_t>(n * format_.numChannels)), ours(theirs.size());
+        if (sf_readf_float(sf_, theirs.data(), n) != n || direct->read(0, ours.data(), n) != n) return;
+        next_ = n;
+        if (std::memcmp(theirs.data(), ours.data(), theirs.size() * sizeof(float)) == 0) direct_ = std::move(direct);
+    }
+
     UniqueFd fd_;
     VirtualFile vfile_;
     SNDFILE *sf_ = nullptr;
@@ -128,6 +158,7 @@ private:
     int64_t next_ = 0;  // the frame libsndfile reads next
     bool random_ = false;
     AUDIOMETADATA *meta_ = nullptr;
+    std::unique_ptr<DirectPcm> direct_;  // set when samples are read straight from the file
     std::mutex mutex_;
 };
 

@@ -3,6 +3,7 @@
 list(APPEND VELMSIGNAL_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/audiofile_api.cpp
   ${CMAKE_CURRENT_LIST_DIR}/convert_reader.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/direct_pcm.cpp
   ${CMAKE_CURRENT_LIST_DIR}/formats.cpp
   ${CMAKE_CURRENT_LIST_DIR}/formatstring.cpp
   ${CMAKE_CURRENT_LIST_DIR}/lasterror.cpp

@@ -16,6 +16,7 @@ public:
     VirtualFile(int fd, int64_t base, int64_t length, bool writable);
     static SF_VIRTUAL_IO *io();  // the callbacks; user data is the VirtualFile
     bool failed() const { return failed_; }  // a read or write error happened
+    int64_t file_offset() const { return base_ + pos_; }  // where libsndfile is in the file
 
 private:
     static sf_count_t get_filelen(void *self);

@@ -104,6 +104,20 @@ TEST_F(Logging, SinkSeesKeptMessagesOnly)
     BLDEBUG_SetLevel(BLDEBUG_LEVEL_INFO);
 }
 
+TEST_F(Logging, WindowsSizePrefixReadsAs64Bit)
+{
+    LogCapture log;
+    const int64_t before = 5000000000, after = 3000000000;
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat"
+#pragma GCC diagnostic ignored "-Wformat-extra-args"
+    BLDEBUG_Log(-1, "Size change: %I64d -> %I64d (%d bytes freed) %5I64u%%", before, after, 7,
+                static_cast<uint64_t>(42));
+#pragma GCC diagnostic pop
+    ASSERT_EQ(log.messages.size(), 1u);
+    EXPECT_EQ(log.messages[0].text, "Size change: 5000000000 -> 3000000000 (7 bytes freed)    42%");
+}
+
 TEST_F(Logging, FileDestinationAppendsLines)
 {
     const std::string path = std::string(VELM_TEST_BINARY_DIR) + "/logging_test.log";

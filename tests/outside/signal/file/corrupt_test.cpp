@@ -6,7 +6,7 @@
 #include <cstring>
 #include <random>
 
-#include "tests/outside/signal/file/file_helpers.hpp"
+#include "tests/outside/signal/file/reader_helpers.hpp"
 
 using namespace velmsig;
 using namespace velmtest;

@@ -49,18 +49,6 @@ bool write_sndfile(const std::string &path, int sf_format, int rate, int channel
     return sf_close(f) == 0 && ok;
 }
 
-std::vector<float> read_all(velmsig::FileReader &reader, int64_t chunk) {
-    int channels = reader.format().numChannels;
-    std::vector<float> all, part(static_cast<size_t>(chunk * channels));
-    for (int64_t at = 0;;) {
-        int64_t n = reader.read(at, part.data(), chunk);
-        if (n <= 0) break;
-        all.insert(all.end(), part.begin(), part.begin() + n * channels);
-        at += n;
-    }
-    return all;
-}
-
 int run(const std::string &command) {
     int status = std::system((command + " >/dev/null 2>&1").c_str());
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;

@@ -6,7 +6,6 @@
 #include <string>
 #include <vector>
 
-#include "outside/signal/file/audiofile_internal.hpp"
 
 namespace velmtest {
 
@@ -29,9 +28,6 @@ std::vector<float> test_signal(int channels, int64_t frames);
 
 // Writes samples with libsndfile; false when it refuses the format.
 bool write_sndfile(const std::string &path, int sf_format, int rate, int channels, const std::vector<float> &samples);
-
-// Every frame of a reader, read in pieces of `chunk` frames.
-std::vector<float> read_all(velmsig::FileReader &reader, int64_t chunk = 1000);
 
 // Runs a shell command quietly; its exit status.
 int run(const std::string &command);

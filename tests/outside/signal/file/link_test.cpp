@@ -2,7 +2,7 @@
 #include <gtest/gtest.h>
 #include <sndfile.h>
 
-#include "tests/outside/signal/file/file_helpers.hpp"
+#include "tests/outside/signal/file/reader_helpers.hpp"
 
 using namespace velmsig;
 using namespace velmtest;

@@ -10,7 +10,7 @@
 
 #include <cmath>
 
-#include "tests/outside/signal/file/file_helpers.hpp"
+#include "tests/outside/signal/file/reader_helpers.hpp"
 
 using namespace velmsig;
 using namespace velmtest;

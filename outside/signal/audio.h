@@ -1,0 +1,13 @@
+/*
+ * Audio signal library: every public header.
+ */
+#ifndef AUDIO_H
+#define AUDIO_H
+
+#include "audioformat.h"
+#include "audiofx.h"
+#include "audiometadata.h"
+#include "audioregion.h"
+#include "audiosignal.h"
+
+#endif /* AUDIO_H */

@@ -1,0 +1,34 @@
+// Little-endian PCM samples read straight from the file: one positioned read
+// into the caller's buffer, widened to floats in place.  Needs no lock, so
+// any number of threads read at once.
+#pragma once
+
+#include <cstdint>
+
+namespace velmsig {
+
+class DirectPcm {
+public:
+    // Codings this path handles (AUDIO_FORMAT_*): 8-bit unsigned, 16, 24 and
+    // 32-bit integers and 32-bit floats, little-endian, on a little-endian host.
+    static bool handles(int coding);
+
+    // fd stays owned by the caller; data_offset is the first frame's byte.
+    DirectPcm(int fd, int64_t data_offset, int coding, int channels);
+
+    // Frames read into out (short at the end of the file), or -1 when the
+    // read fails.
+    int64_t read(int64_t first, float *out, int64_t count) const;
+
+    int64_t bytes_per_frame() const { return bytes_per_frame_; }
+
+private:
+    int fd_;
+    int64_t data_offset_;
+    int coding_;
+    int channels_;
+    int bytes_per_sample_;
+    int64_t bytes_per_frame_;
+};
+
+}  // namespace velmsig

@@ -1,0 +1,212 @@
+#include "outside/signal/store/chunk.hpp"
+
+#include <algorithm>
+#include <atomic>
+#include <cstring>
+
+#include "outside/signal/store/block_file.hpp"
+#include "outside/signal/store/sample_source.hpp"
+#include "outside/signal/store/store_config.hpp"
+
+namespace velmsig {
+
+namespace {
+
+std::atomic<uint64_t> next_chunk_id{1};
+std::atomic<int64_t> memory_in_use{0};
+
+int64_t window_count(int64_t frames)
+{
+    return (frames + kWindowFrames - 1) / kWindowFrames;
+}
+
+class MemoryChunk final : public Chunk {
+public:
+    MemoryChunk(const float *samples, int64_t count)
+        : Chunk(count, summarize(samples, count)), data_(samples, samples + count)
+    {
+        memory_in_use += memory_bytes();
+    }
+    ~MemoryChunk() override { memory_in_use -= memory_bytes(); }
+
+    bool read(int64_t first, int64_t count, float *out) const override
+    {
+        std::memcpy(out, data_.data() + first, size_t(count) * sizeof(float));
+        return true;
+    }
+    const float *samples() const override { return data_.data(); }
+    int64_t memory_bytes() const override { return int64_t(data_.size() * sizeof(float)); }
+
+private:
+    std::vector<float> data_;
+};
+
+class SilenceChunk final : public Chunk {
+public:
+    explicit SilenceChunk(int64_t count) : Chunk(count) {}
+    bool read(int64_t, int64_t count, float *out) const override
+    {
+        std::fill(out, out + count, 0.0f);
+        return true;
+    }
+    bool is_silence() const override { return true; }
+};
+
+class BlockFileChunk final : public Chunk {
+public:
+    BlockFileChunk(BlockFile *file, int64_t slot, int64_t count, std::vector<MinMax> windows)
+        : Chunk(count, std::move(windows)), file_(file), slot_(slot)
+    {
+    }
+    ~BlockFileChunk() override { file_->release(slot_); }
+
+    bool read(int64_t first, int64_t count, float *out) const override
+    {
+        return file_->load(slot_, first, count, out);
+    }
+
+private:
+    BlockFile *file_;
+    int64_t slot_;
+};
+
+class SourceChunk final : public Chunk {
+public:
+    SourceChunk(std::shared_ptr<SampleSource> source, int channel, int64_t first, int64_t count,
+                std::vector<MinMax> windows)
+        : Chunk(count, std::move(windows)), source_(std::move(source)), channel_(channel), first_(first)
+    {
+    }
+
+    bool read(int64_t first, int64_t count, float *out) const override
+    {
+        // The source gives every channel; one reusable buffer per thread.
+        thread_local std::vector<float> frames;
+        const int channels = source_->channels();
+        frames.resize(size_t(count) * size_t(channels));
+        if (source_->read(first_ + first, frames.data(), count) != count) return false;
+        for (int64_t i = 0; i < count; ++i) out[i] = frames[size_t(i * channels + channel_)];
+        return true;
+    }
+
+private:
+    std::shared_ptr<SampleSource> source_;
+    int channel_;
+    int64_t first_;
+};
+
+ChunkPtr store_in_block_file(const float *samples, int64_t count, std::vector<MinMax> windows)
+{
+    BlockFile *file = BlockFile::instance();
+    if (!file) return nullptr;
+    int64_t slot = file->store(samples, count);
+    if (slot < 0) return nullptr;
+    return std::make_shared<BlockFileChunk>(file, slot, count, std::move(windows));
+}
+
+}  // namespace
+
+MinMax scan_minmax(const float *samples, int64_t count)
+{
+    float lo = __builtin_inff(), hi = -__builtin_inff();
+    for (int64_t i = 0; i < count; ++i) {
+        lo = std::min(lo, samples[i]);
+        hi = std::max(hi, samples[i]);
+    }
+    return {lo, hi};
+}
+
+std::vector<MinMax> summarize(const float *samples, int64_t count)
+{
+    std::vector<MinMax> windows(size_t(window_count(count)));
+    for (size_t w = 0; w < windows.size(); ++w) {
+        int64_t begin = int64_t(w) * kWindowFrames;
+        windows[w] = scan_minmax(samples + begin, std::min(kWindowFrames, count - begin));
+    }
+    return windows;
+}
+
+Chunk::Chunk(int64_t frames, std::vector<MinMax> windows)
+    : frames_(frames), id_(next_chunk_id++), windows_(std::move(windows)), whole_(MinMax::empty())
+{
+    for (const MinMax &w : windows_) whole_.add(w);
+}
+
+Chunk::Chunk(int64_t frames)
+    : frames_(frames), id_(next_chunk_id++), windows_(size_t(window_count(frames)), MinMax{0.0f, 0.0f}),
+      whole_{0.0f, 0.0f}
+{
+}
+
+Chunk::~Chunk() = default;
+
+MinMax Chunk::raw_minmax(int64_t a, int64_t b, WindowCache &cache) const
+{
+    if (const float *data = samples()) return scan_minmax(data + a, b - a);
+    MinMax result = MinMax::empty();
+    while (a < b) {
+        const int64_t window = a / kWindowFrames;
+        const int64_t begin = window * kWindowFrames;
+        if (cache.chunk_id != id_ || cache.window != window) {
+            const int64_t count = std::min(kWindowFrames, frames_ - begin);
+            if (!read(begin, count, cache.samples)) std::fill(cache.samples, cache.samples + count, 0.0f);
+            cache.chunk_id = id_;
+            cache.window = window;
+            cache.count = int32_t(count);
+        }
+        const int64_t stop = std::min(b, begin + cache.count);
+        result.add(scan_minmax(cache.samples + (a - begin), stop - a));
+        a = stop;
+    }
+    return result;
+}
+
+MinMax Chunk::minmax(int64_t a, int64_t b, WindowCache &cache) const
+{
+    if (a == 0 && b == frames_) return whole_;
+    // Whole windows inside [a, b); the chunk's last window may be short.
+    const int64_t first = (a + kWindowFrames - 1) / kWindowFrames;
+    const int64_t last = b == frames_ ? int64_t(windows_.size()) : b / kWindowFrames;
+    if (first >= last) return raw_minmax(a, b, cache);
+    MinMax result = MinMax::empty();
+    if (a < first * kWindowFrames) result.add(raw_minmax(a, first * kWindowFrames, cache));
+    for (int64_t w = first; w < last; ++w) result.add(windows_[size_t(w)]);
+    if (last * kWindowFrames < b) result.add(raw_minmax(last * kWindowFrames, b, cache));
+    return result;
+}
+
+ChunkPtr make_chunk(const float *samples, int64_t count, Placement placement)
+{
+    const int64_t bytes = count * int64_t(sizeof(float));
+    if (placement == Placement::BlockFile || memory_in_use + bytes > memory_budget_bytes()) {
+        if (ChunkPtr stored = store_in_block_file(samples, count, summarize(samples, count))) return stored;
+        // Without a usable block file the samples must still be kept.
+    }
+    return std::make_shared<MemoryChunk>(samples, count);
+}
+
+const ChunkPtr &silence_chunk()
+{
+    static const ChunkPtr silence = std::make_shared<SilenceChunk>(kChunkFrames);
+    return silence;
+}
+
+ChunkPtr make_source_chunk(std::shared_ptr<SampleSource> source, int channel, int64_t first, int64_t count,
+                           std::vector<MinMax> windows)
+{
+    return std::make_shared<SourceChunk>(std::move(source), channel, first, count, std::move(windows));
+}
+
+ChunkPtr move_to_block_file(const Chunk &chunk)
+{
+    const float *data = chunk.samples();
+    if (!data) return nullptr;
+    return store_in_block_file(data, chunk.frames(), summarize(data, chunk.frames()));
+}
+
+int64_t chunk_memory_in_use()
+{
+    return memory_in_use;
+}
+
+}  // namespace velmsig

@@ -1,0 +1,149 @@
+// Opening signals from files and saving them, through the file part's
+// readers and writers.
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <string>
+#include <vector>
+
+#include "outside/signal/file/audiofile_internal.hpp"
+#include "outside/signal/store/sample_source.hpp"
+#include "outside/signal/store/signal_internal.hpp"
+
+using namespace velmsig;
+
+namespace {
+
+// An open file read in place by the chunks that refer to it.
+class ReaderSource final : public SampleSource {
+public:
+    explicit ReaderSource(std::unique_ptr<FileReader> reader) : reader_(std::move(reader)) {}
+    int channels() const override { return reader_->format().numChannels; }
+    int64_t frames() const override { return reader_->frames(); }
+    int64_t read(int64_t first, float *out, int64_t count) override { return reader_->read(first, out, count); }
+
+private:
+    std::unique_ptr<FileReader> reader_;
+};
+
+// One pass over the file: PCM chunks keep only their summaries and read the
+// file in place later; other codings are decoded once into the block file.
+bool scan(const std::shared_ptr<SampleSource> &source, bool in_place, std::vector<SegmentsPtr> &result)
+{
+    const int channels = source->channels();
+    std::vector<float> frames(size_t(kChunkFrames) * size_t(channels));
+    std::vector<float> samples(static_cast<size_t>(kChunkFrames));
+    std::vector<SegmentsBuilder> builders(static_cast<size_t>(channels));
+    for (int64_t at = 0;; ) {
+        const int64_t want = in_place ? std::min(kChunkFrames, source->frames() - at) : kChunkFrames;
+        if (want <= 0) break;
+        const int64_t n = source->read(at, frames.data(), want);
+        if (n < 0 || (in_place && n != want)) return false;
+        for (int c = 0; c < channels; ++c) {
+            for (int64_t i = 0; i < n; ++i) samples[size_t(i)] = frames[size_t(i * channels + c)];
+            if (in_place) {
+                builders[size_t(c)].append({make_source_chunk(source, c, at, n, summarize(samples.data(), n)), 0, n});
+            } else {
+                builders[size_t(c)].append_samples(samples.data(), n, Placement::BlockFile);
+            }
+        }
+        at += n;
+        if (n < want) break;
+    }
+    for (SegmentsBuilder &builder : builders) result.push_back(builder.build());
+    return true;
+}
+
+// Records the file a signal was opened from or saved to.
+void bind_file(_audio_signal &signal, const char *path, std::string format_text)
+{
+    struct stat info{};
+    const bool known = ::stat(path, &info) == 0;
+    std::lock_guard<std::mutex> guard(signal.lock);
+    signal.file_name = path;
+    signal.format_text = std::move(format_text);
+    signal.file_size = known ? int64_t(info.st_size) : 0;
+    signal.file_time = known ? uint64_t(info.st_mtim.tv_sec) * 1000000000u + uint64_t(info.st_mtim.tv_nsec) : 0;
+    signal.read_only = ::access(path, W_OK) != 0;
+}
+
+// The format text with "AUTO" replaced by the detected format's name.
+std::string resolved_format_text(const char *text, const char *detected)
+{
+    std::string result = text && *text ? text : "AUTO";
+    const size_t at = result.find("AUTO");
+    if (at != std::string::npos && detected && *detected) result.replace(at, 4, detected);
+    return result;
+}
+
+}  // namespace
+
+extern "C" {
+
+AUDIOSIGNAL *AUDIOSIGNAL_OpenEx(const char *file_name, const char *format_text, int flags, void *parent,
+                                AUDIOSIGNAL_CALLBACK callback)
+{
+    if (!file_name) {
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
+        return nullptr;
+    }
+    std::unique_ptr<FileReader> reader = open_reader(file_name, format_text);
+    if (!reader) return nullptr;
+    const AUDIO_FORMAT format = reader->format();
+    if (!valid_format(&format)) {
+        set_last_error(AUDIO_ERROR_UNSUPPORTED_FORMAT);  // more channels than a mask can name
+        return nullptr;
+    }
+    const bool in_place = reader->random_access();
+    const std::string text = resolved_format_text(format_text, reader->format_name());
+    AUDIOMETADATA *metadata =
+        (flags & AUDIOSIGNAL_OPEN_METADATA) && reader->metadata() ? AUDIOMETADATA_Duplicate(reader->metadata()) : nullptr;
+
+    std::vector<SegmentsPtr> channels;
+    if (!scan(std::make_shared<ReaderSource>(std::move(reader)), in_place, channels)) {
+        AUDIOMETADATA_Destroy(metadata);
+        set_last_error(AUDIO_ERROR_READ);
+        return nullptr;
+    }
+    _audio_signal *signal = create_signal(format);
+    install_segments(*signal, channels);
+    signal->reset_stamp = signal->stamp;
+    signal->metadata = metadata;
+    signal->parent = parent;
+    signal->callback = callback;
+    bind_file(*signal, file_name, text);
+    return signal;
+}
+
+int AUDIOSIGNAL_Save(AUDIOSIGNAL *signal, const char *file_name, const char *format_text)
+{
+    if (!signal || !file_name) {
+        set_last_error(AUDIO_ERROR_BAD_ARGUMENT);
+        return 0;
+    }
+    AUDIO_FORMAT format;
+    AUDIOSIGNAL_GetFormat(signal, &format);
+    std::unique_ptr<FileWriter> writer = create_writer(file_name, format, format_text, signal->metadata);
+    if (!writer) return 0;
+    const std::vector<SegmentsPtr> channels = all_segments(*signal);
+    const size_t width = channels.size();
+    const int64_t length = channels[0]->length();
+    std::vector<float> samples(static_cast<size_t>(kChunkFrames));
+    std::vector<float> frames(size_t(kChunkFrames) * width);
+    for (int64_t at = 0; at < length; at += kChunkFrames) {
+        const int64_t n = std::min(kChunkFrames, length - at);
+        for (size_t c = 0; c < width; ++c) {
+            if (!channels[c]->read(at, n, samples.data())) {
+                set_last_error(AUDIO_ERROR_READ);
+                return 0;  // the writer goes without touching the target
+            }
+            for (int64_t i = 0; i < n; ++i) frames[size_t(i) * width + c] = samples[size_t(i)];
+        }
+        if (!writer->write(frames.data(), n)) return 0;
+    }
+    if (!writer->commit()) return 0;
+    bind_file(*signal, file_name, format_text && *format_text ? format_text : "AUTO");
+    return 1;
+}
+
+}  // extern "C"
