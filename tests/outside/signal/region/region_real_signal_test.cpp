@@ -1,60 +1,11 @@
 // Regions on the signal library's own signals: they move with edits, travel
 // with duplicates, ask the signal's parent for track numbers, and live in
 // the WAV files the signals are saved to.
-#include <gtest/gtest.h>
-
-#include <map>
-#include <string>
-
-#include "outside/signal/audio.h"
-#include "tests/outside/signal/region/region_test_support.hpp"
+#include "tests/outside/signal/region/region_signal_support.hpp"
 
 namespace {
 
-AUDIO_FORMAT mono(int rate)
-{
-    AUDIO_FORMAT format{};
-    format.sampleRate = rate;
-    format.numChannels = 1;
-    format.bitsPerSample = 16;
-    return format;
-}
-
-struct Document {
-    std::map<std::string, int> tracks{{"default", 0}};
-    std::map<std::string, std::string> labels;
-
-    static int callback(void *parent, int code, void *data1, void *data2)
-    {
-        auto *doc = static_cast<Document *>(parent);
-        const std::string name = static_cast<const char *>(data1);
-        if (code == 0x10025) {
-            auto it = doc->tracks.find(name);
-            if (it == doc->tracks.end()) {
-                if (doc->tracks.size() >= 8) return 0;
-                it = doc->tracks.emplace(name, int(doc->tracks.size())).first;
-            }
-            *static_cast<int32_t *>(data2) = it->second;
-            return 1;
-        }
-        if (code == 0x10026) doc->labels[name] = static_cast<const char *>(data2);
-        return 1;
-    }
-};
-
-class RealSignal : public ::testing::Test {
-protected:
-    AUDIO_FORMAT format = mono(8000);
-    AUDIOSIGNAL *signal = AUDIOSIGNAL_CreateSilence(&format, 80000);   // ten seconds
-    ScratchDir dir;
-
-    void TearDown() override { AUDIOSIGNAL_Destroy(signal); }
-
-    AUDIOREGION *add(double begin, double end, const char *label = nullptr, int track = 0)
-    {
-        return AUDIOSIGNAL_AddRegionToTrackEx(signal, 0, begin, end, label, nullptr, track);
-    }
-};
+using RealSignal = SignalTest;
 
 TEST_F(RealSignal, CutsAndPastesMoveRegions)
 {
@@ -92,7 +43,7 @@ TEST_F(RealSignal, RegionEditsAreChangesOfTheSignal)
 
 TEST_F(RealSignal, DuplicatesHaveTheirOwnRegions)
 {
-    AUDIOREGION *original = add(1.0, 2.0, "kept");
+    AUDIOREGION *original = add(1.0, 2.0, 0, "kept");
     AUDIOSIGNAL *copy = AUDIOSIGNAL_DuplicateEx(signal, 0);
     ASSERT_NE(copy, nullptr);
     AUDIOREGION *copied = AUDIOSIGNAL_FindFirstRegion(copy, 0);
@@ -107,8 +58,6 @@ TEST_F(RealSignal, DuplicatesHaveTheirOwnRegions)
 
 TEST_F(RealSignal, TrackNamesComeFromTheParent)
 {
-    Document doc;
-    ASSERT_TRUE(AUDIOSIGNAL_SetParentObject(signal, &doc, Document::callback));
     const std::string path = dir.file("tracks.vrgn");
     write_bytes(path,
                 "VELM-REGIONS\t1\n"
@@ -126,8 +75,8 @@ TEST_F(RealSignal, CuesInTheSavedWaveFile)
 {
     const std::string path = dir.file("take.wav");
     ASSERT_TRUE(AUDIOSIGNAL_Save(signal, path.c_str(), "WAVE"));
-    add(0.25, 0.25, "cue");
-    add(1.0, 1.5, "range");
+    add(0.25, 0.25, 0, "cue");
+    add(1.0, 1.5, 0, "range");
     ASSERT_EQ(AUDIOSIGNAL_WriteRegions(signal, path.c_str(), "AUTO"), 1);
 
     AUDIOSIGNAL *opened = AUDIOSIGNAL_OpenEx(path.c_str(), "AUTO", 0, nullptr, nullptr);
