@@ -130,23 +130,44 @@ Region *RegionSet::add(double begin, double end, int track, uint32_t flags, cons
     return r;
 }
 
+bool RegionSet::matches(const Region *r, const RegionQuery &q) const
+{
+    if (r->flags & q.skip_flags) return false;
+    if (q.tracks && !(q.tracks & (1u << (r->flags & kTrackBits)))) return false;
+    if (q.end > q.begin &&
+        (to_sample(end_of(r)) < q.begin || to_sample(r->begin) > q.end))
+        return false;
+    return !q.filter || q.filter(r);
+}
+
 std::vector<Region *> RegionSet::select(const RegionQuery &q) const
 {
-    const bool timed = q.end > q.begin;
     std::vector<Region *> out;
-    for (const auto &owned : regions_) {
-        Region *r = owned.get();
-        if (r->flags & q.skip_flags) continue;
-        if (q.tracks && !(q.tracks & (1u << (r->flags & kTrackBits)))) continue;
-        if (timed) {
-            const int64_t b = to_sample(r->begin), e = to_sample(end_of(r));
-            if (e < q.begin || b > q.end) continue;
-        }
-        if (q.filter && !q.filter(r)) continue;
-        out.push_back(r);
-    }
+    for (const auto &owned : regions_)
+        if (matches(owned.get(), q)) out.push_back(owned.get());
     std::sort(out.begin(), out.end(), region_before);
     return out;
+}
+
+size_t RegionSet::count(const RegionQuery &q) const
+{
+    return size_t(std::count_if(regions_.begin(), regions_.end(),
+                                [&](const auto &owned) { return matches(owned.get(), q); }));
+}
+
+Region *RegionSet::nearest(const Region *from, int track, bool after) const
+{
+    // One pass, no sorting: walking a long track step by step stays linear per step.
+    Region *best = nullptr;
+    for (const auto &owned : regions_) {
+        Region *r = owned.get();
+        if ((r->flags & AUDIOREGION_FLAG_DELETED) ||
+            (track >= 0 && int(r->flags & kTrackBits) != track) || r == from)
+            continue;
+        if (from && (after ? !region_before(from, r) : !region_before(r, from))) continue;
+        if (!best || (after ? region_before(r, best) : region_before(best, r))) best = r;
+    }
+    return best;
 }
 
 std::vector<Region *> RegionSet::track_regions(int track) const
