@@ -294,6 +294,15 @@ AUDIO_API int AUDIOSIGNAL_MixPasteEx(AUDIOSIGNAL *signal, AUDIOSIGNAL *source, i
                                      int64_t begin, int64_t end, double gain, int64_t *length);
 AUDIO_API int AUDIOSIGNAL_SilenceEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t end);
 AUDIO_API int AUDIOSIGNAL_ReverseEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t end);
+/* Runs begin..end of the active channels through an effect script (see
+ * audiofx.h) that keeps the rate and channel count; the result replaces
+ * the range.  A bad script fails with nothing changed. */
+AUDIO_API int AUDIOSIGNAL_ApplyEffectEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t end,
+                                        const char *effect);
+/* A new signal: all of the signal through an effect script, which may
+ * change rate, channels and bits ("fmtconv[sr=48000,nc=1]"); metadata and
+ * regions come along.  Null for a bad script. */
+AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_ApplyTransform(AUDIOSIGNAL *signal, const char *effect);
 /* Returns the frames appended (frames, or -1 on failure). */
 AUDIO_API int64_t AUDIOSIGNAL_AppendSilence(AUDIOSIGNAL *signal, int64_t frames);
 /* Swaps the two channels of a stereo signal. */

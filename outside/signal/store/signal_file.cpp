@@ -1,9 +1,15 @@
 // Opening signals from files and saving them, through the file part's
 // readers and writers.
+#ifdef __SSE2__
+#include <immintrin.h>
+#endif
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <atomic>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "outside/signal/file/audiofile_internal.hpp"
@@ -26,29 +32,114 @@ private:
     std::unique_ptr<FileReader> reader_;
 };
 
-// One pass over the file: PCM chunks keep only their summaries and read the
-// file in place later; other codings are decoded once into the block file.
-bool scan(const std::shared_ptr<SampleSource> &source, bool in_place, std::vector<SegmentsPtr> &result)
+// Extremes of window w of every channel into result, kept in registers.
+void summarize_window(const float *frames, int64_t begin, int64_t end, int channels, size_t w,
+                      std::vector<std::vector<MinMax>> &result)
+{
+    float lo[AUDIOSIGNAL_MAX_CHANNELS], hi[AUDIOSIGNAL_MAX_CHANNELS];
+    for (int c = 0; c < channels; ++c) {
+        lo[c] = __builtin_inff();
+        hi[c] = -__builtin_inff();
+    }
+    int64_t i = begin;
+#ifdef __SSE2__
+    // With 1, 2 or 4 channels every lane of four samples stays on one channel.
+    if (4 % channels == 0) {
+        __m128 vlo = _mm_set1_ps(__builtin_inff()), vhi = _mm_set1_ps(-__builtin_inff());
+        const float *p = frames + begin * channels, *stop = frames + end * channels;
+        for (; p + 4 <= stop; p += 4) {
+            const __m128 x = _mm_loadu_ps(p);
+            vlo = _mm_min_ps(vlo, x);
+            vhi = _mm_max_ps(vhi, x);
+        }
+        alignas(16) float l[4], h[4];
+        _mm_store_ps(l, vlo);
+        _mm_store_ps(h, vhi);
+        for (int k = 0; k < 4; ++k) {
+            lo[k % channels] = std::min(lo[k % channels], l[k]);
+            hi[k % channels] = std::max(hi[k % channels], h[k]);
+        }
+        i = (p - frames) / channels;
+    }
+#endif
+    for (; i < end; ++i) {
+        const float *frame = frames + i * channels;
+        for (int c = 0; c < channels; ++c) {
+            lo[c] = std::min(lo[c], frame[c]);
+            hi[c] = std::max(hi[c], frame[c]);
+        }
+    }
+    for (int c = 0; c < channels; ++c) result[size_t(c)][w] = {lo[c], hi[c]};
+}
+
+// Summaries of every channel of n interleaved frames, in one pass.
+std::vector<std::vector<MinMax>> summarize_frames(const float *frames, int64_t n, int channels)
+{
+    const size_t windows = size_t((n + kWindowFrames - 1) / kWindowFrames);
+    std::vector<std::vector<MinMax>> result(static_cast<size_t>(channels), std::vector<MinMax>(windows));
+    for (size_t w = 0; w < windows; ++w) {
+        const int64_t begin = int64_t(w) * kWindowFrames, end = std::min(n, begin + kWindowFrames);
+        summarize_window(frames, begin, end, channels, w, result);
+    }
+    return result;
+}
+
+// PCM read in place: chunks keep only their summaries and read the file
+// later.  The pieces are independent, so threads share the scan.
+bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<SegmentsPtr> &result)
 {
     const int channels = source->channels();
+    const int64_t pieces = (source->frames() + kChunkFrames - 1) / kChunkFrames;
+    std::vector<std::vector<ChunkPtr>> chunks(static_cast<size_t>(channels),
+                                             std::vector<ChunkPtr>(static_cast<size_t>(pieces)));
+    std::atomic<int64_t> next{0};
+    std::atomic<bool> failed{false};
+    auto work = [&] {
+        std::vector<float> frames(size_t(kChunkFrames) * size_t(channels));
+        for (int64_t k = next++; k < pieces && !failed; k = next++) {
+            const int64_t at = k * kChunkFrames, n = std::min(kChunkFrames, source->frames() - at);
+            if (source->read(at, frames.data(), n) != n) {
+                failed = true;
+                return;
+            }
+            std::vector<std::vector<MinMax>> windows = summarize_frames(frames.data(), n, channels);
+            for (int c = 0; c < channels; ++c) {
+                chunks[size_t(c)][size_t(k)] = make_source_chunk(source, c, at, n, std::move(windows[size_t(c)]));
+            }
+        }
+    };
+    const unsigned helpers = std::min(3u, std::max(1u, std::thread::hardware_concurrency()) - 1);
+    std::vector<std::thread> threads;
+    for (unsigned t = 0; t < helpers && int64_t(t + 1) < pieces; ++t) threads.emplace_back(work);
+    work();
+    for (std::thread &thread : threads) thread.join();
+    if (failed) return false;
+    for (int c = 0; c < channels; ++c) {
+        SegmentsBuilder builder;
+        for (int64_t k = 0; k < pieces; ++k) {
+            const ChunkPtr &chunk = chunks[size_t(c)][size_t(k)];
+            builder.append({chunk, 0, chunk->frames()});
+        }
+        result.push_back(builder.build());
+    }
+    return true;
+}
+
+// Other codings are decoded once, in order, into the block file; the
+// reader's frame count is only a claim, so reading goes on to a short read.
+bool scan_decoded(SampleSource &source, std::vector<SegmentsPtr> &result)
+{
+    const int channels = source.channels();
     std::vector<float> frames(size_t(kChunkFrames) * size_t(channels));
     std::vector<float> samples(static_cast<size_t>(kChunkFrames));
     std::vector<SegmentsBuilder> builders(static_cast<size_t>(channels));
-    for (int64_t at = 0;; ) {
-        const int64_t want = in_place ? std::min(kChunkFrames, source->frames() - at) : kChunkFrames;
-        if (want <= 0) break;
-        const int64_t n = source->read(at, frames.data(), want);
-        if (n < 0 || (in_place && n != want)) return false;
+    for (int64_t at = 0, n = kChunkFrames; n == kChunkFrames; at += n) {
+        n = source.read(at, frames.data(), kChunkFrames);
+        if (n < 0) return false;
         for (int c = 0; c < channels; ++c) {
             for (int64_t i = 0; i < n; ++i) samples[size_t(i)] = frames[size_t(i * channels + c)];
-            if (in_place) {
-                builders[size_t(c)].append({make_source_chunk(source, c, at, n, summarize(samples.data(), n)), 0, n});
-            } else {
-                builders[size_t(c)].append_samples(samples.data(), n, Placement::BlockFile);
-            }
+            builders[size_t(c)].append_samples(samples.data(), n, Placement::BlockFile);
         }
-        at += n;
-        if (n < want) break;
     }
     for (SegmentsBuilder &builder : builders) result.push_back(builder.build());
     return true;
@@ -100,7 +191,8 @@ AUDIOSIGNAL *AUDIOSIGNAL_OpenEx(const char *file_name, const char *format_text, 
         (flags & AUDIOSIGNAL_OPEN_METADATA) && reader->metadata() ? AUDIOMETADATA_Duplicate(reader->metadata()) : nullptr;
 
     std::vector<SegmentsPtr> channels;
-    if (!scan(std::make_shared<ReaderSource>(std::move(reader)), in_place, channels)) {
+    auto source = std::make_shared<ReaderSource>(std::move(reader));
+    if (!(in_place ? scan_in_place(source, channels) : scan_decoded(*source, channels))) {
         AUDIOMETADATA_Destroy(metadata);
         set_last_error(AUDIO_ERROR_READ);
         return nullptr;

@@ -6,6 +6,7 @@ list(APPEND VELMSIGNAL_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/signal_api.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_core.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_edit.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/signal_effect.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_file.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_pipe.cpp
   ${CMAKE_CURRENT_LIST_DIR}/signal_read.cpp
