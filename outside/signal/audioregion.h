@@ -192,10 +192,10 @@ AUDIO_API int AUDIOSIGNAL_AdjustRegionChildShares(AUDIOSIGNAL *signal);
 /* ---- Region files ------------------------------------------------------- */
 
 /* Format texts, without regard to case, optionally with "[track=NAME]":
- *   "LABELS"  tab-separated text, one "begin<TAB>end<TAB>label" line per
+ *   "LABELS" (or "TXT")  tab-separated text, one "begin<TAB>end<TAB>label" line per
  *             region, times in seconds (point labels have begin = end;
  *             frequency lines starting with a backslash are skipped);
- *   "WAVE"    cue points and labelled ranges inside a WAV file (cue and
+ *   "WAVE" (or "WAV")  cue points and labelled ranges inside a WAV file (cue and
  *             LIST/adtl chunks); writing rewrites an existing WAV file;
  *   "VRGN"    this library's own text format: tracks, nesting, comments
  *             and flags, read back without loss;

@@ -96,6 +96,8 @@ public:
     // Hooks for the signal's edits, in frames: regions move with the audio.
     // A cut before a region shifts it, through it shortens it, over all of it
     // deletes it; an insertion before it shifts it, inside it lengthens it.
+    // Regions that do not move are not written (a recording thread appends
+    // through on_insert while the interface reads the regions).
     void on_insert(int64_t at, int64_t frames);
     void on_remove(int64_t at, int64_t frames);
     // Adds copies of the live regions of other (a duplicated signal).

@@ -181,7 +181,10 @@ std::vector<Region *> RegionSet::track_regions(int track) const
 void RegionSet::on_insert(int64_t at, int64_t frames)
 {
     if (frames <= 0 || at < 0 || sample_rate() == 0) return;
+    // Recording appends from its own thread: regions it does not move are
+    // not written at all.
     const double shift = to_seconds(frames);
+    bool moved = false;
     for (const auto &owned : regions_) {
         Region *r = owned.get();
         const int64_t b = to_sample(r->begin), e = to_sample(end_of(r));
@@ -189,18 +192,23 @@ void RegionSet::on_insert(int64_t at, int64_t frames)
             r->begin += shift;
         else if (at < e)
             r->length += shift;
+        else
+            continue;
+        moved = true;
     }
-    adjust_child_shares();
+    if (moved) adjust_child_shares();
 }
 
 void RegionSet::on_remove(int64_t at, int64_t frames)
 {
     if (frames <= 0 || at < 0 || sample_rate() == 0) return;
     const int64_t stop = at + frames;
+    bool moved = false;
     for (const auto &owned : regions_) {
         Region *r = owned.get();
         const int64_t b = to_sample(r->begin), e = to_sample(end_of(r));
         if (e <= at) continue;                       // wholly before the cut
+        moved = true;
         if (b >= stop) {                             // wholly after it
             r->begin -= to_seconds(frames);
             continue;
@@ -214,7 +222,7 @@ void RegionSet::on_remove(int64_t at, int64_t frames)
         if (gone) r->flags |= AUDIOREGION_FLAG_DELETED;
         r->flags |= AUDIOREGION_FLAG_CHANGED;
     }
-    adjust_child_shares();
+    if (moved) adjust_child_shares();
 }
 
 void RegionSet::copy_from(const RegionSet &other)
