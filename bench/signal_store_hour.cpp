@@ -164,6 +164,37 @@ void BM_CutPasteClearRestore(benchmark::State &state)
 }
 BENCHMARK(BM_CutPasteClearRestore)->Arg(60)->Arg(3600)->Unit(benchmark::kMicrosecond);
 
+// One hundred cuts and pastes at arbitrary positions, each with its saved
+// state kept as an undo history keeps it: the memory they hold together.
+void BM_HundredEditsWithSavedStates(benchmark::State &state)
+{
+    AUDIOSIGNAL *signal = opened(int(state.range(0)));
+    const int64_t frames = AUDIOSIGNAL_NumSamples(signal);
+    int64_t held = 0;
+    for (auto _ : state) {
+        AUDIOSIGNAL *work = AUDIOSIGNAL_DuplicateEx(signal, 0);
+        const int64_t before = AUDIOSIGNAL_SizeInMemory(work) + AUDIOSIGNAL_SizeInMemory(signal);
+        std::vector<AUDIOSIGNAL_STATE> states(100);
+        uint64_t position = 99;
+        for (AUDIOSIGNAL_STATE &saved : states) {
+            position = position * 6364136223846793005ull + 1442695040888963407ull;
+            const int64_t at = int64_t(position >> 20) % (frames - 100000);
+            AUDIOSIGNAL_SaveState(work, &saved);
+            AUDIOSIGNAL *cut = AUDIOSIGNAL_CutEx(work, nullptr, 0, at, at + 4410);
+            AUDIOSIGNAL_PasteEx(work, cut, 0, at / 2, at / 2, nullptr);
+            AUDIOSIGNAL_Destroy(cut);
+        }
+        held = AUDIOSIGNAL_SizeInMemory(work) + AUDIOSIGNAL_SizeInMemory(signal) - before;
+        for (const AUDIOSIGNAL_STATE &saved : states) {
+            for (int c = 0; c < saved.numChannels; ++c) held += AUDIOBLOCKSLIST_SizeInMemory(saved.blocksList[c]);
+        }
+        for (AUDIOSIGNAL_STATE &saved : states) AUDIOSIGNAL_ClearState(&saved);
+        AUDIOSIGNAL_Destroy(work);
+    }
+    state.counters["held_KB"] = double(held) / 1024;
+}
+BENCHMARK(BM_HundredEditsWithSavedStates)->Arg(60)->Arg(3600)->Unit(benchmark::kMillisecond);
+
 }  // namespace
 
 BENCHMARK_MAIN();
