@@ -90,6 +90,8 @@ bool BlockFile::load(int64_t slot, int64_t first, int64_t count, float *out) con
 
 void BlockFile::release(int64_t slot)
 {
+    // The disk space goes back at once; the slot is used again later.
+    ::fallocate(fd_, FALLOC_FL_PUNCH_HOLE | FALLOC_FL_KEEP_SIZE, off_t(slot * kSlotBytes), off_t(kSlotBytes));
     std::lock_guard<std::mutex> guard(lock_);
     free_.push_back(slot);
 }

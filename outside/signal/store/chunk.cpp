@@ -53,7 +53,6 @@ public:
         std::fill(out, out + count, 0.0f);
         return true;
     }
-    bool is_silence() const override { return true; }
 };
 
 class BlockFileChunk final : public Chunk {
@@ -249,11 +248,6 @@ ChunkPtr move_to_block_file(const Chunk &chunk)
     const float *data = chunk.samples();
     if (!data) return nullptr;
     return store_in_block_file(data, chunk.frames(), summarize(data, chunk.frames()));
-}
-
-int64_t chunk_memory_in_use()
-{
-    return memory_in_use;
 }
 
 }  // namespace velmsig

@@ -59,8 +59,6 @@ public:
     virtual const float *samples() const { return nullptr; }
     // Bytes of sample memory this chunk holds.
     virtual int64_t memory_bytes() const { return 0; }
-    // True when every sample is 0 and nothing is stored.
-    virtual bool is_silence() const { return false; }
 
     // Sequence entries referring to this chunk: they share its memory.
     void hold() const { ++holders_; }
@@ -108,8 +106,5 @@ ChunkPtr move_to_block_file(const Chunk &chunk);
 
 // Summaries of count samples, one entry per window.
 std::vector<MinMax> summarize(const float *samples, int64_t count);
-
-// Sample bytes held in memory by all chunks of the process.
-int64_t chunk_memory_in_use();
 
 }  // namespace velmsig
