@@ -9,5 +9,6 @@
 #include "audiometadata.h"
 #include "audioregion.h"
 #include "audiosignal.h"
+#include "dspb.h"
 
 #endif /* AUDIO_H */

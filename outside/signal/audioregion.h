@@ -96,10 +96,10 @@ AUDIO_API int AUDIOREGION_SetChanged(AUDIOREGION *region, uint8_t on);
 AUDIO_API int AUDIOREGION_SetHideText(AUDIOREGION *region, uint8_t on);
 AUDIO_API int AUDIOREGION_SetReadOnly(AUDIOREGION *region, uint8_t on);
 
-/* Not deleted and not read-only. */
+/* Whether a user may delete the region: not deleted and not read-only. */
 AUDIO_API int AUDIOREGION_CanDelete(const AUDIOREGION *region);
-/* Marks the region and its descendants deleted / not deleted; flags are
- * reserved.  Delete refuses read-only regions. */
+/* Marks the region and its descendants deleted / not deleted (read-only
+ * ones too: callers ask CanDelete first); flags are reserved. */
 AUDIO_API int AUDIOREGION_DeleteEx(AUDIOREGION *region, int flags);
 AUDIO_API int AUDIOREGION_UndeleteEx(AUDIOREGION *region, int flags);
 
@@ -192,10 +192,10 @@ AUDIO_API int AUDIOSIGNAL_AdjustRegionChildShares(AUDIOSIGNAL *signal);
 /* ---- Region files ------------------------------------------------------- */
 
 /* Format texts, without regard to case, optionally with "[track=NAME]":
- *   "LABELS"  tab-separated text, one "begin<TAB>end<TAB>label" line per
+ *   "LABELS" (or "TXT")  tab-separated text, one "begin<TAB>end<TAB>label" line per
  *             region, times in seconds (point labels have begin = end;
  *             frequency lines starting with a backslash are skipped);
- *   "WAVE"    cue points and labelled ranges inside a WAV file (cue and
+ *   "WAVE" (or "WAV")  cue points and labelled ranges inside a WAV file (cue and
  *             LIST/adtl chunks); writing rewrites an existing WAV file;
  *   "VRGN"    this library's own text format: tracks, nesting, comments
  *             and flags, read back without loss;

@@ -96,6 +96,8 @@ public:
     // Hooks for the signal's edits, in frames: regions move with the audio.
     // A cut before a region shifts it, through it shortens it, over all of it
     // deletes it; an insertion before it shifts it, inside it lengthens it.
+    // Regions that do not move are not written (a recording thread appends
+    // through on_insert while the interface reads the regions).
     void on_insert(int64_t at, int64_t frames);
     void on_remove(int64_t at, int64_t frames);
     // Adds copies of the live regions of other (a duplicated signal).
@@ -114,7 +116,11 @@ public:
                 const char *label, const char *comment);
     size_t size() const { return regions_.size(); }
     std::vector<Region *> select(const RegionQuery &query) const;   // in time order
+    size_t count(const RegionQuery &query) const;
     std::vector<Region *> track_regions(int track) const;           // live, time order
+    // The live region of a track (-1: any) next after / before `from` in
+    // time order; with a null `from`, the first / last one.
+    Region *nearest(const Region *from, int track, bool after) const;
 
     // Region edits (also through the AUDIOREGION_ calls).
     bool change_edge(Region *region, double time, bool end, int mode);
@@ -140,6 +146,8 @@ public:
     static constexpr size_t kMaxText = 1u << 16;  // bytes of a label or comment
 
 private:
+    bool matches(const Region *r, const RegionQuery &q) const;
+
     RegionHost *host_;
     std::vector<std::unique_ptr<Region>> regions_;   // creation order
     std::map<int, std::string> track_names_;         // learned through the host

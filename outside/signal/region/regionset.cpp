@@ -130,23 +130,44 @@ Region *RegionSet::add(double begin, double end, int track, uint32_t flags, cons
     return r;
 }
 
+bool RegionSet::matches(const Region *r, const RegionQuery &q) const
+{
+    if (r->flags & q.skip_flags) return false;
+    if (q.tracks && !(q.tracks & (1u << (r->flags & kTrackBits)))) return false;
+    if (q.end > q.begin &&
+        (to_sample(end_of(r)) < q.begin || to_sample(r->begin) > q.end))
+        return false;
+    return !q.filter || q.filter(r);
+}
+
 std::vector<Region *> RegionSet::select(const RegionQuery &q) const
 {
-    const bool timed = q.end > q.begin;
     std::vector<Region *> out;
-    for (const auto &owned : regions_) {
-        Region *r = owned.get();
-        if (r->flags & q.skip_flags) continue;
-        if (q.tracks && !(q.tracks & (1u << (r->flags & kTrackBits)))) continue;
-        if (timed) {
-            const int64_t b = to_sample(r->begin), e = to_sample(end_of(r));
-            if (e < q.begin || b > q.end) continue;
-        }
-        if (q.filter && !q.filter(r)) continue;
-        out.push_back(r);
-    }
+    for (const auto &owned : regions_)
+        if (matches(owned.get(), q)) out.push_back(owned.get());
     std::sort(out.begin(), out.end(), region_before);
     return out;
+}
+
+size_t RegionSet::count(const RegionQuery &q) const
+{
+    return size_t(std::count_if(regions_.begin(), regions_.end(),
+                                [&](const auto &owned) { return matches(owned.get(), q); }));
+}
+
+Region *RegionSet::nearest(const Region *from, int track, bool after) const
+{
+    // One pass, no sorting: walking a long track step by step stays linear per step.
+    Region *best = nullptr;
+    for (const auto &owned : regions_) {
+        Region *r = owned.get();
+        if ((r->flags & AUDIOREGION_FLAG_DELETED) ||
+            (track >= 0 && int(r->flags & kTrackBits) != track) || r == from)
+            continue;
+        if (from && (after ? !region_before(from, r) : !region_before(r, from))) continue;
+        if (!best || (after ? region_before(r, best) : region_before(best, r))) best = r;
+    }
+    return best;
 }
 
 std::vector<Region *> RegionSet::track_regions(int track) const
@@ -160,7 +181,10 @@ std::vector<Region *> RegionSet::track_regions(int track) const
 void RegionSet::on_insert(int64_t at, int64_t frames)
 {
     if (frames <= 0 || at < 0 || sample_rate() == 0) return;
+    // Recording appends from its own thread: regions it does not move are
+    // not written at all.
     const double shift = to_seconds(frames);
+    bool moved = false;
     for (const auto &owned : regions_) {
         Region *r = owned.get();
         const int64_t b = to_sample(r->begin), e = to_sample(end_of(r));
@@ -168,18 +192,23 @@ void RegionSet::on_insert(int64_t at, int64_t frames)
             r->begin += shift;
         else if (at < e)
             r->length += shift;
+        else
+            continue;
+        moved = true;
     }
-    adjust_child_shares();
+    if (moved) adjust_child_shares();
 }
 
 void RegionSet::on_remove(int64_t at, int64_t frames)
 {
     if (frames <= 0 || at < 0 || sample_rate() == 0) return;
     const int64_t stop = at + frames;
+    bool moved = false;
     for (const auto &owned : regions_) {
         Region *r = owned.get();
         const int64_t b = to_sample(r->begin), e = to_sample(end_of(r));
         if (e <= at) continue;                       // wholly before the cut
+        moved = true;
         if (b >= stop) {                             // wholly after it
             r->begin -= to_seconds(frames);
             continue;
@@ -193,7 +222,7 @@ void RegionSet::on_remove(int64_t at, int64_t frames)
         if (gone) r->flags |= AUDIOREGION_FLAG_DELETED;
         r->flags |= AUDIOREGION_FLAG_CHANGED;
     }
-    adjust_child_shares();
+    if (moved) adjust_child_shares();
 }
 
 void RegionSet::copy_from(const RegionSet &other)

@@ -42,7 +42,7 @@ RegionQuery selected_of(int track)
 int count(AUDIOSIGNAL *signal, const RegionQuery &q)
 {
     const RegionSet *set = regions_of(signal);
-    return set ? int(set->select(q).size()) : 0;
+    return set ? int(set->count(q)) : 0;
 }
 
 int fill(AUDIOSIGNAL *signal, const RegionQuery &q, AUDIOREGION **array, int max)
@@ -66,14 +66,7 @@ AUDIOREGION *neighbour(AUDIOSIGNAL *signal, const AUDIOREGION *region, bool next
 {
     RegionSet *set = regions_of(signal);
     const Region *r = set ? own_region(set, region) : nullptr;
-    if (!r) return nullptr;
-    const std::vector<Region *> track = set->track_regions(int(r->flags & AUDIOREGION_TRACK_MASK));
-    if (next) {
-        auto it = std::upper_bound(track.begin(), track.end(), r, velmsig::region_before);
-        return it == track.end() ? nullptr : *it;
-    }
-    auto it = std::lower_bound(track.begin(), track.end(), r, velmsig::region_before);
-    return it == track.begin() ? nullptr : *(it - 1);
+    return r ? set->nearest(r, int(r->flags & AUDIOREGION_TRACK_MASK), next) : nullptr;
 }
 
 bool matches(const Region *r, const RegionSet &set, int64_t begin, int64_t end, int match)
@@ -177,17 +170,13 @@ int AUDIOSIGNAL_GetSelectedRegions(AUDIOSIGNAL *signal, int track, AUDIOREGION *
 AUDIOREGION *AUDIOSIGNAL_FindFirstRegion(AUDIOSIGNAL *signal, int track)
 {
     const RegionSet *set = regions_of(signal);
-    if (!set || !valid_track(track)) return nullptr;
-    const std::vector<Region *> regions = set->track_regions(track);
-    return regions.empty() ? nullptr : regions.front();
+    return set && valid_track(track) ? set->nearest(nullptr, track, true) : nullptr;
 }
 
 AUDIOREGION *AUDIOSIGNAL_FindLastRegion(AUDIOSIGNAL *signal, int track)
 {
     const RegionSet *set = regions_of(signal);
-    if (!set || !valid_track(track)) return nullptr;
-    const std::vector<Region *> regions = set->track_regions(track);
-    return regions.empty() ? nullptr : regions.back();
+    return set && valid_track(track) ? set->nearest(nullptr, track, false) : nullptr;
 }
 
 AUDIOREGION *AUDIOSIGNAL_FindNextRegion(AUDIOSIGNAL *signal, const AUDIOREGION *region)

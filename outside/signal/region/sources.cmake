@@ -1,5 +1,5 @@
-# Regions and region files.  The core needs nothing of the other parts; the
-# signal calls need the store's signals.
+# Regions and region files.  The core needs nothing of the other parts (its
+# tests build it in); the signal calls reach regions through the store.
 set(VELMSIGNAL_REGION_CORE
   ${CMAKE_CURRENT_LIST_DIR}/regionset.cpp
   ${CMAKE_CURRENT_LIST_DIR}/region_content.cpp
@@ -9,8 +9,5 @@ set(VELMSIGNAL_REGION_CORE
   ${CMAKE_CURRENT_LIST_DIR}/region_own.cpp
   ${CMAKE_CURRENT_LIST_DIR}/region_wave.cpp
   ${CMAKE_CURRENT_LIST_DIR}/region_file.cpp)
-set(VELMSIGNAL_REGION_SIGNAL_CALLS ${CMAKE_CURRENT_LIST_DIR}/signal_region_api.cpp)
-list(APPEND VELMSIGNAL_SOURCES ${VELMSIGNAL_REGION_CORE})
-if(EXISTS ${CMAKE_CURRENT_LIST_DIR}/../store/sources.cmake)
-  list(APPEND VELMSIGNAL_SOURCES ${VELMSIGNAL_REGION_SIGNAL_CALLS})
-endif()
+list(APPEND VELMSIGNAL_SOURCES ${VELMSIGNAL_REGION_CORE}
+  ${CMAKE_CURRENT_LIST_DIR}/signal_region_api.cpp)

@@ -10,8 +10,11 @@ namespace velmsig {
 
 class SampleSource;
 
-// Largest chunk, and the frames summarised by one window entry.
+// Largest chunk of new samples, largest chunk of a file read in place (it
+// holds no samples, so fewer, longer ones keep block lists short), and the
+// frames summarised by one window entry.
 constexpr int64_t kChunkFrames = 65536;
+constexpr int64_t kSourceChunkFrames = 1 << 20;
 constexpr int64_t kWindowFrames = 256;
 
 struct MinMax {
@@ -25,6 +28,10 @@ struct MinMax {
 };
 
 MinMax scan_minmax(const float *samples, int64_t count);
+// Extremes of each channel of count interleaved frames into out[channel].
+void scan_frames(const float *frames, int64_t count, int channels, MinMax *out);
+// The union of count summary entries.
+MinMax merge_minmax(const MinMax *entries, int64_t count);
 
 // The raw samples of one window, kept by a reader that scans forward so that
 // the window shared by two consecutive ranges is fetched once.
@@ -52,8 +59,6 @@ public:
     virtual const float *samples() const { return nullptr; }
     // Bytes of sample memory this chunk holds.
     virtual int64_t memory_bytes() const { return 0; }
-    // True when every sample is 0 and nothing is stored.
-    virtual bool is_silence() const { return false; }
 
     // Sequence entries referring to this chunk: they share its memory.
     void hold() const { ++holders_; }
@@ -101,8 +106,5 @@ ChunkPtr move_to_block_file(const Chunk &chunk);
 
 // Summaries of count samples, one entry per window.
 std::vector<MinMax> summarize(const float *samples, int64_t count);
-
-// Sample bytes held in memory by all chunks of the process.
-int64_t chunk_memory_in_use();
 
 }  // namespace velmsig

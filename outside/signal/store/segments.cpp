@@ -4,63 +4,108 @@
 
 namespace velmsig {
 
-Segments::Segments(std::vector<Segment> parts) : parts_(std::move(parts))
+namespace {
+
+std::vector<int64_t> running_starts(size_t count, auto length_of)
 {
-    starts_.reserve(parts_.size() + 1);
+    std::vector<int64_t> starts;
+    starts.reserve(count + 1);
     int64_t position = 0;
-    starts_.push_back(0);
-    for (const Segment &s : parts_) {
-        starts_.push_back(position += s.length);
-        s.chunk->hold();
-    }
+    starts.push_back(0);
+    for (size_t i = 0; i < count; ++i) starts.push_back(position += length_of(i));
+    return starts;
 }
 
-Segments::~Segments()
+size_t index_of(const std::vector<int64_t> &starts, int64_t position)
+{
+    return size_t(std::upper_bound(starts.begin(), starts.end(), position) - starts.begin()) - 1;
+}
+
+}  // namespace
+
+Page::Page(std::vector<Segment> parts)
+    : parts_(std::move(parts)), starts_(running_starts(parts_.size(), [&](size_t i) { return parts_[i].length; }))
+{
+    for (const Segment &s : parts_) s.chunk->hold();
+}
+
+Page::~Page()
 {
     for (const Segment &s : parts_) s.chunk->release();
 }
 
-size_t Segments::locate(int64_t position) const
+size_t Page::locate(int64_t position) const
 {
-    auto it = std::upper_bound(starts_.begin(), starts_.end(), position);
-    return size_t(it - starts_.begin()) - 1;
+    return index_of(starts_, position);
+}
+
+Segments::Segments(std::vector<PagePtr> pages)
+    : pages_(std::move(pages)), starts_(running_starts(pages_.size(), [&](size_t i) { return pages_[i]->length(); }))
+{
+}
+
+std::vector<Segment> Segments::parts() const
+{
+    std::vector<Segment> result;
+    for (const PagePtr &page : pages_) result.insert(result.end(), page->parts().begin(), page->parts().end());
+    return result;
+}
+
+template <typename Visit>
+void Segments::walk(int64_t first, int64_t count, Visit visit) const
+{
+    for (size_t p = index_of(starts_, first); count > 0; ++p) {
+        const Page &page = *pages_[p];
+        for (size_t i = page.locate(first - starts_[p]); count > 0 && i < page.parts().size(); ++i) {
+            const Segment &s = page.parts()[i];
+            const int64_t inside = first - starts_[p] - page.start(i);
+            const int64_t n = std::min(count, s.length - inside);
+            visit(s, s.offset + inside, n);
+            first += n;
+            count -= n;
+        }
+    }
 }
 
 bool Segments::read(int64_t first, int64_t count, float *out) const
 {
     bool ok = true;
-    for (size_t i = locate(first); count > 0; ++i) {
-        const Segment &s = parts_[i];
-        const int64_t inside = first - starts_[i];
-        const int64_t n = std::min(count, s.length - inside);
-        ok = s.chunk->read(s.offset + inside, n, out) && ok;
+    walk(first, count, [&](const Segment &s, int64_t from, int64_t n) {
+        ok = s.chunk->read(from, n, out) && ok;
         out += n;
-        first += n;
-        count -= n;
-    }
+    });
     return ok;
 }
 
 MinMax Segments::minmax(int64_t first, int64_t count, WindowCache &cache) const
 {
     MinMax result = MinMax::empty();
-    for (size_t i = locate(first); count > 0; ++i) {
-        const Segment &s = parts_[i];
-        const int64_t inside = first - starts_[i];
-        const int64_t n = std::min(count, s.length - inside);
-        result.add(s.chunk->minmax(s.offset + inside, s.offset + inside + n, cache));
-        first += n;
-        count -= n;
-    }
+    walk(first, count, [&](const Segment &s, int64_t from, int64_t n) {
+        result.add(s.chunk->minmax(from, from + n, cache));
+    });
     return result;
 }
 
 int64_t Segments::memory_share() const
 {
     int64_t bytes = 0;
-    for (const Segment &s : parts_) {
-        const int64_t held = s.chunk->memory_bytes();
-        if (held > 0) bytes += held / std::max<int64_t>(1, s.chunk->holders());
+    for (const PagePtr &page : pages_) {
+        int64_t page_bytes = 0;
+        for (const Segment &s : page->parts()) {
+            const int64_t held = s.chunk->memory_bytes();
+            if (held > 0) page_bytes += held / std::max<int64_t>(1, s.chunk->holders());
+        }
+        bytes += page_bytes / std::max<long>(1, page.use_count());
+    }
+    return bytes;
+}
+
+int64_t Segments::table_bytes() const
+{
+    int64_t bytes = int64_t(pages_.size() * (sizeof(PagePtr) + sizeof(int64_t)));
+    for (const PagePtr &page : pages_) {
+        const int64_t page_bytes = int64_t(sizeof(Page) + page->parts().size() * (sizeof(Segment) + sizeof(int64_t)));
+        bytes += page_bytes / std::max<long>(1, page.use_count());
     }
     return bytes;
 }
@@ -69,27 +114,56 @@ void SegmentsBuilder::append(const Segment &segment)
 {
     if (segment.length <= 0) return;
     length_ += segment.length;
-    if (!parts_.empty()) {
-        Segment &last = parts_.back();
+    if (!open_.empty()) {
+        Segment &last = open_.back();
         if (last.chunk == segment.chunk && last.offset + last.length == segment.offset) {
             last.length += segment.length;
             return;
         }
     }
-    parts_.push_back(segment);
+    open_.push_back(segment);
+    if (open_.size() == kPageParts) close_page();
+}
+
+void SegmentsBuilder::append_page(const PagePtr &page)
+{
+    // A page that fits beside the loose slices joins them, so that edits do
+    // not leave a trail of small pages.
+    if (open_.size() + page->parts().size() <= kPageParts) {
+        for (const Segment &s : page->parts()) append(s);
+        return;
+    }
+    close_page();
+    pages_.push_back(page);
+    length_ += page->length();
+}
+
+void SegmentsBuilder::close_page()
+{
+    if (open_.empty()) return;
+    pages_.push_back(std::make_shared<const Page>(std::move(open_)));
+    open_.clear();
 }
 
 void SegmentsBuilder::append_range(const Segments &source, int64_t begin, int64_t end)
 {
     begin = std::max<int64_t>(begin, 0);
     end = std::min(end, source.length());
-    if (begin >= end) return;
-    for (size_t i = source.locate(begin); begin < end; ++i) {
-        const Segment &s = source.parts()[i];
-        const int64_t inside = begin - source.start(i);
-        const int64_t n = std::min(end - begin, s.length - inside);
-        append({s.chunk, s.offset + inside, n});
-        begin += n;
+    int64_t page_begin = 0;
+    for (const PagePtr &page : source.pages()) {
+        const int64_t page_end = page_begin + page->length();
+        if (begin <= page_begin && page_end <= end) {
+            append_page(page);
+        } else if (begin < page_end && page_begin < end) {
+            const int64_t from = std::max(begin, page_begin) - page_begin, to = std::min(end, page_end) - page_begin;
+            for (size_t i = page->locate(from); i < page->parts().size() && page->start(i) < to; ++i) {
+                const Segment &s = page->parts()[i];
+                const int64_t a = std::max(from, page->start(i)), b = std::min(to, page->start(i) + s.length);
+                append({s.chunk, s.offset + (a - page->start(i)), b - a});
+            }
+        }
+        page_begin = page_end;
+        if (page_begin >= end) break;
     }
 }
 
@@ -114,8 +188,11 @@ void SegmentsBuilder::append_silence(int64_t count)
 
 SegmentsPtr SegmentsBuilder::build()
 {
+    close_page();
     length_ = 0;
-    return std::make_shared<const Segments>(std::move(parts_));
+    auto result = std::make_shared<const Segments>(std::move(pages_));
+    pages_.clear();
+    return result;
 }
 
 }  // namespace velmsig

@@ -102,9 +102,9 @@ AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags)
     auto *copy = new _audio_signal;
     std::lock_guard<std::mutex> guard(signal->lock);
     copy->format = signal->format;
-    // Own sequences (sharing every chunk) so that each signal counts its share.
+    // Own sequences (sharing every page) so that each signal counts its share.
     for (const _audio_blocks_list *list : signal->lists) {
-        copy->lists.push_back(adopt_list(std::make_shared<const Segments>(list->segments->parts())));
+        copy->lists.push_back(adopt_list(std::make_shared<const Segments>(list->segments->pages())));
     }
     copy->active_mask = signal->active_mask;
     copy->stamp = signal->stamp;

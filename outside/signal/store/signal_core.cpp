@@ -71,7 +71,7 @@ int64_t list_memory_share(const _audio_blocks_list &list)
 {
     std::lock_guard<std::mutex> guard(list_lock());
     const int64_t holders = std::max(1, list.holds + (list.in_use ? 1 : 0));
-    return (list.segments->memory_share() + int64_t(list.segments->parts().size() * sizeof(Segment))) / holders;
+    return (list.segments->memory_share() + list.segments->table_bytes()) / holders;
 }
 
 SegmentsPtr channel_segments(const _audio_signal &signal, int channel)

@@ -3,7 +3,10 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <atomic>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "outside/signal/file/audiofile_internal.hpp"
@@ -26,29 +29,76 @@ private:
     std::unique_ptr<FileReader> reader_;
 };
 
-// One pass over the file: PCM chunks keep only their summaries and read the
-// file in place later; other codings are decoded once into the block file.
-bool scan(const std::shared_ptr<SampleSource> &source, bool in_place, std::vector<SegmentsPtr> &result)
+// Summaries of every channel of n interleaved frames, in one pass.
+std::vector<std::vector<MinMax>> summarize_frames(const float *frames, int64_t n, int channels)
+{
+    const size_t windows = size_t((n + kWindowFrames - 1) / kWindowFrames);
+    std::vector<std::vector<MinMax>> result(static_cast<size_t>(channels), std::vector<MinMax>(windows));
+    MinMax window[AUDIOSIGNAL_MAX_CHANNELS];
+    for (size_t w = 0; w < windows; ++w) {
+        const int64_t begin = int64_t(w) * kWindowFrames, end = std::min(n, begin + kWindowFrames);
+        scan_frames(frames + begin * channels, end - begin, channels, window);
+        for (int c = 0; c < channels; ++c) result[size_t(c)][w] = window[c];
+    }
+    return result;
+}
+
+// PCM read in place: chunks keep only their summaries and read the file
+// later.  The pieces are independent, so threads share the scan.
+bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<SegmentsPtr> &result)
 {
     const int channels = source->channels();
+    const int64_t pieces = (source->frames() + kSourceChunkFrames - 1) / kSourceChunkFrames;
+    std::vector<std::vector<ChunkPtr>> chunks(static_cast<size_t>(channels),
+                                             std::vector<ChunkPtr>(static_cast<size_t>(pieces)));
+    std::atomic<int64_t> next{0};
+    std::atomic<bool> failed{false};
+    auto work = [&] {
+        std::vector<float> frames(size_t(kSourceChunkFrames) * size_t(channels));
+        for (int64_t k = next++; k < pieces && !failed; k = next++) {
+            const int64_t at = k * kSourceChunkFrames, n = std::min(kSourceChunkFrames, source->frames() - at);
+            if (source->read(at, frames.data(), n) != n) {
+                failed = true;
+                return;
+            }
+            std::vector<std::vector<MinMax>> windows = summarize_frames(frames.data(), n, channels);
+            for (int c = 0; c < channels; ++c) {
+                chunks[size_t(c)][size_t(k)] = make_source_chunk(source, c, at, n, std::move(windows[size_t(c)]));
+            }
+        }
+    };
+    const unsigned helpers = std::min(3u, std::max(1u, std::thread::hardware_concurrency()) - 1);
+    std::vector<std::thread> threads;
+    for (unsigned t = 0; t < helpers && int64_t(t + 1) < pieces; ++t) threads.emplace_back(work);
+    work();
+    for (std::thread &thread : threads) thread.join();
+    if (failed) return false;
+    for (int c = 0; c < channels; ++c) {
+        SegmentsBuilder builder;
+        for (int64_t k = 0; k < pieces; ++k) {
+            const ChunkPtr &chunk = chunks[size_t(c)][size_t(k)];
+            builder.append({chunk, 0, chunk->frames()});
+        }
+        result.push_back(builder.build());
+    }
+    return true;
+}
+
+// Other codings are decoded once, in order, into the block file; the
+// reader's frame count is only a claim, so reading goes on to a short read.
+bool scan_decoded(SampleSource &source, std::vector<SegmentsPtr> &result)
+{
+    const int channels = source.channels();
     std::vector<float> frames(size_t(kChunkFrames) * size_t(channels));
     std::vector<float> samples(static_cast<size_t>(kChunkFrames));
     std::vector<SegmentsBuilder> builders(static_cast<size_t>(channels));
-    for (int64_t at = 0;; ) {
-        const int64_t want = in_place ? std::min(kChunkFrames, source->frames() - at) : kChunkFrames;
-        if (want <= 0) break;
-        const int64_t n = source->read(at, frames.data(), want);
-        if (n < 0 || (in_place && n != want)) return false;
+    for (int64_t at = 0, n = kChunkFrames; n == kChunkFrames; at += n) {
+        n = source.read(at, frames.data(), kChunkFrames);
+        if (n < 0) return false;
         for (int c = 0; c < channels; ++c) {
             for (int64_t i = 0; i < n; ++i) samples[size_t(i)] = frames[size_t(i * channels + c)];
-            if (in_place) {
-                builders[size_t(c)].append({make_source_chunk(source, c, at, n, summarize(samples.data(), n)), 0, n});
-            } else {
-                builders[size_t(c)].append_samples(samples.data(), n, Placement::BlockFile);
-            }
+            builders[size_t(c)].append_samples(samples.data(), n, Placement::BlockFile);
         }
-        at += n;
-        if (n < want) break;
     }
     for (SegmentsBuilder &builder : builders) result.push_back(builder.build());
     return true;
@@ -100,7 +150,8 @@ AUDIOSIGNAL *AUDIOSIGNAL_OpenEx(const char *file_name, const char *format_text, 
         (flags & AUDIOSIGNAL_OPEN_METADATA) && reader->metadata() ? AUDIOMETADATA_Duplicate(reader->metadata()) : nullptr;
 
     std::vector<SegmentsPtr> channels;
-    if (!scan(std::make_shared<ReaderSource>(std::move(reader)), in_place, channels)) {
+    auto source = std::make_shared<ReaderSource>(std::move(reader));
+    if (!(in_place ? scan_in_place(source, channels) : scan_decoded(*source, channels))) {
         AUDIOMETADATA_Destroy(metadata);
         set_last_error(AUDIO_ERROR_READ);
         return nullptr;

@@ -151,16 +151,13 @@ TEST_F(Regions, CutsMoveShortenOrRemoveRegions)
            *after = add(6.0, 7.0), *point_at_cut = add(2.0, 2.0), *point_in_cut = add(2.5, 2.5);
     set.on_remove(16000, 8000);
 
-    auto span = [](const Region *r) {
-        return std::make_pair(AUDIOREGION_BeginSample(r), AUDIOREGION_EndSample(r));
-    };
-    EXPECT_EQ(span(before), std::make_pair(int64_t(4000), int64_t(12000)));
-    EXPECT_EQ(span(touching), std::make_pair(int64_t(8000), int64_t(16000)));
-    EXPECT_EQ(span(through_begin), std::make_pair(int64_t(12000), int64_t(16000)));
-    EXPECT_EQ(span(through_end), std::make_pair(int64_t(16000), int64_t(24000)));
-    EXPECT_EQ(span(over), std::make_pair(int64_t(8000), int64_t(32000)));
-    EXPECT_EQ(span(after), std::make_pair(int64_t(40000), int64_t(48000)));
-    EXPECT_EQ(span(point_at_cut), std::make_pair(int64_t(16000), int64_t(16000)));
+    EXPECT_EQ(span(before), Span(4000, 12000));
+    EXPECT_EQ(span(touching), Span(8000, 16000));
+    EXPECT_EQ(span(through_begin), Span(12000, 16000));
+    EXPECT_EQ(span(through_end), Span(16000, 24000));
+    EXPECT_EQ(span(over), Span(8000, 32000));
+    EXPECT_EQ(span(after), Span(40000, 48000));
+    EXPECT_EQ(span(point_at_cut), Span(16000, 16000));
     EXPECT_TRUE(AUDIOREGION_IsDeleted(inside));
     EXPECT_TRUE(AUDIOREGION_IsDeleted(point_in_cut));
     EXPECT_FALSE(AUDIOREGION_IsDeleted(through_end));
@@ -172,13 +169,10 @@ TEST_F(Regions, InsertionsShiftOrLengthenRegions)
     Region *before = add(0.5, 1.0), *at_begin = add(2.0, 3.0), *around = add(1.5, 2.5),
            *at_end = add(1.0, 2.0);
     set.on_insert(16000, 4000);   // half a second at 2 s
-    EXPECT_EQ(AUDIOREGION_BeginSample(before), 4000);
-    EXPECT_EQ(AUDIOREGION_EndSample(before), 8000);
-    EXPECT_EQ(AUDIOREGION_BeginSample(at_begin), 20000);
-    EXPECT_EQ(AUDIOREGION_EndSample(at_begin), 28000);
-    EXPECT_EQ(AUDIOREGION_BeginSample(around), 12000);
-    EXPECT_EQ(AUDIOREGION_EndSample(around), 24000);
-    EXPECT_EQ(AUDIOREGION_EndSample(at_end), 16000);
+    EXPECT_EQ(span(before), Span(4000, 8000));
+    EXPECT_EQ(span(at_begin), Span(20000, 28000));
+    EXPECT_EQ(span(around), Span(12000, 24000));
+    EXPECT_EQ(span(at_end), Span(8000, 16000));
 }
 
 TEST_F(Regions, QueriesFilterByTimeTrackFlagsAndFunction)

@@ -1,80 +1,38 @@
-// The AUDIOSIGNAL_ region calls, over stand-in signals that hold only their
-// regions (the store's signals answer signal_regions the same way).
-#include <gtest/gtest.h>
-
-#include <map>
-
+// The AUDIOSIGNAL_ region calls on the library's signals.
 #include "outside/base/blbase.h"
-#include "outside/signal/region/region_internal.hpp"
-#include "tests/outside/signal/region/region_test_support.hpp"
+#include "tests/outside/signal/region/region_signal_support.hpp"
 
 namespace {
 
-struct StandInSignal : TestHost {
-    velmsig::RegionSet regions{this};
-    AUDIOSIGNAL *handle() { return region_signal(); }
-};
+using SignalRegions = SignalTest;
 
-std::map<AUDIOSIGNAL *, velmsig::RegionSet *> &signals()
+TEST_F(SignalRegions, NullSignalsAndBadArgumentsFail)
 {
-    static std::map<AUDIOSIGNAL *, velmsig::RegionSet *> all;
-    return all;
-}
-
-}  // namespace
-
-velmsig::RegionSet *velmsig::signal_regions(AUDIOSIGNAL *signal)
-{
-    auto it = signals().find(signal);
-    return it == signals().end() ? nullptr : it->second;
-}
-
-namespace {
-
-class SignalRegions : public ::testing::Test {
-protected:
-    StandInSignal stand_in;   // 8000 Hz, ten seconds
-    AUDIOSIGNAL *signal = stand_in.handle();
-    ScratchDir dir;
-
-    void SetUp() override
-    {
-        signals()[signal] = &stand_in.regions;
-        AUDIOSIGNAL_ResetLastError();
-    }
-    void TearDown() override { signals().erase(signal); }
-
-    AUDIOREGION *add(double begin, double end, int track, const char *label = nullptr)
-    {
-        return AUDIOSIGNAL_AddRegionToTrackEx(signal, 0, begin, end, label, nullptr, track);
-    }
-};
-
-TEST_F(SignalRegions, UnknownSignalsFail)
-{
-    AUDIOSIGNAL *unknown = reinterpret_cast<AUDIOSIGNAL *>(&dir);
     EXPECT_EQ(AUDIOSIGNAL_AddRegionToTrackEx(nullptr, 0, 0, 1, "x", nullptr, 0), nullptr);
     EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_BAD_ARGUMENT);
-    EXPECT_EQ(AUDIOSIGNAL_CountRegions(unknown, 0, 0, 0, 0, nullptr), 0);
-    EXPECT_EQ(AUDIOSIGNAL_FindFirstRegion(unknown, -1), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_CountRegions(nullptr, 0, 0, 0, 0, nullptr), 0);
+    EXPECT_EQ(AUDIOSIGNAL_FindFirstRegion(nullptr, -1), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_FindNextRegion(signal, nullptr), nullptr);
     EXPECT_EQ(AUDIOSIGNAL_ReadRegions(nullptr, "x.txt", "LABELS"), 0);
     EXPECT_EQ(AUDIOSIGNAL_DeleteAllRegions(nullptr), 0);
     EXPECT_EQ(AUDIOSIGNAL_GetRegions(signal, nullptr, 4, 0, 0, 0, 0, nullptr), 0);
 }
 
-TEST_F(SignalRegions, AddingNotifiesUnlessQuietAndKeepsOnlyRegionFlags)
+TEST_F(SignalRegions, AddingChangesTheSignalUnlessQuietAndKeepsOnlyRegionFlags)
 {
+    ASSERT_TRUE(AUDIOSIGNAL_ResetChanges(signal));
     AUDIOREGION *r = AUDIOSIGNAL_AddRegionToTrackEx(
         signal, 0x08 | 0x20 | 0x40 | AUDIOREGION_FLAG_READONLY, 1.0, 2.0, "a", "b", 2);
     ASSERT_NE(r, nullptr);
     EXPECT_FALSE(AUDIOREGION_IsDeleted(r));
     EXPECT_FALSE(AUDIOREGION_CanDelete(r));
     EXPECT_TRUE(AUDIOREGION_IsChanged(r));
-    EXPECT_EQ(stand_in.changes, 1);
+    EXPECT_TRUE(AUDIOSIGNAL_HasChanges(signal));
+    ASSERT_TRUE(AUDIOSIGNAL_ResetChanges(signal));
     ASSERT_NE(AUDIOSIGNAL_AddRegionToTrackEx(signal, AUDIOREGION_ADD_QUIET, 3.0, 4.0, nullptr,
                                              nullptr, 2),
               nullptr);
-    EXPECT_EQ(stand_in.changes, 1);
+    EXPECT_FALSE(AUDIOSIGNAL_HasChanges(signal));
     EXPECT_EQ(AUDIOSIGNAL_AddRegionToTrackEx(signal, 0, 3.0, 4.0, nullptr, nullptr, 16), nullptr);
 }
 
@@ -142,10 +100,9 @@ TEST_F(SignalRegions, WalkingATrack)
     AUDIOREGION copy = *a;
     EXPECT_EQ(AUDIOSIGNAL_FindNextRegion(signal, &copy), c);
 
-    StandInSignal foreign;
-    signals()[foreign.handle()] = &foreign.regions;
-    EXPECT_EQ(AUDIOSIGNAL_FindNextRegion(foreign.handle(), a), nullptr);
-    signals().erase(foreign.handle());
+    AUDIOSIGNAL *foreign = AUDIOSIGNAL_CreateSilence(&format, 8000);
+    EXPECT_EQ(AUDIOSIGNAL_FindNextRegion(foreign, a), nullptr);
+    AUDIOSIGNAL_Destroy(foreign);
 }
 
 TEST_F(SignalRegions, FindingByPlaceAndText)
@@ -242,7 +199,7 @@ TEST_F(SignalRegions, RegionFilesThroughTheSignal)
     BLDEBUG_SetSink(nullptr, nullptr);
     ASSERT_EQ(log.messages.size(), 1u);
     EXPECT_NE(log.messages[0].find("line 2"), std::string::npos);
-    EXPECT_EQ(AUDIOSIGNAL_CountRegions(signal, 0, 0, AUDIOREGION_TRACK_BIT(stand_in.tracks["words"]),
+    EXPECT_EQ(AUDIOSIGNAL_CountRegions(signal, 0, 0, AUDIOREGION_TRACK_BIT(doc.tracks["words"]),
                                        0, nullptr),
               2);
 

@@ -46,6 +46,14 @@ struct TestHost : velmsig::RegionHost {
     void regions_changed() override { ++changes; }
 };
 
+// First and end sample of a region.
+inline std::pair<int64_t, int64_t> span(const AUDIOREGION *r)
+{
+    return {AUDIOREGION_BeginSample(r), AUDIOREGION_EndSample(r)};
+}
+
+using Span = std::pair<int64_t, int64_t>;
+
 // A folder of its own under the test binary folder, removed afterwards.
 class ScratchDir {
 public:

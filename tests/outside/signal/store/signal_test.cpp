@@ -3,6 +3,7 @@
 #include <cstring>
 #include <thread>
 
+#include "outside/base/blbase.h"
 #include "store_test_support.hpp"
 
 using namespace store_test;
@@ -154,6 +155,17 @@ TEST(SignalStoreSignal, DuplicatesShareTheirBlocks)
     EXPECT_EQ(read_all(signal), original);
     AUDIOSIGNAL_Destroy(copy);
     EXPECT_EQ(AUDIOSIGNAL_SizeInMemory(signal), alone);
+    AUDIOSIGNAL_Destroy(signal);
+}
+
+TEST(SignalStoreSignal, SamplesBeyondTheMemoryLimitGoToTheBlockFile)
+{
+    ASSERT_EQ(BLSETTINGS_ChangeEx(nullptr, "audiosignal.cache.memorylimit=0"), 1);
+    const Channels samples = random_channels(2, 150000, 7);
+    AUDIOSIGNAL *signal = make_signal(samples);
+    BLSETTINGS_DeleteEx(nullptr, "audiosignal.cache.memorylimit");
+    EXPECT_LT(AUDIOSIGNAL_SizeInMemory(signal), 100000);
+    EXPECT_EQ(read_all(signal), samples);
     AUDIOSIGNAL_Destroy(signal);
 }
 
