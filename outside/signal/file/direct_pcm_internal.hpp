@@ -1,6 +1,6 @@
-// Little-endian PCM samples read straight from the file: one positioned read
-// into the caller's buffer, widened to floats in place.  Needs no lock, so
-// any number of threads read at once.
+// Little-endian PCM samples read straight from the file with positioned
+// reads and widened to floats.  Needs no lock, so any number of threads read
+// at once.
 #pragma once
 
 #include <cstdint>
@@ -27,7 +27,6 @@ private:
     int64_t data_offset_;
     int coding_;
     int channels_;
-    int bytes_per_sample_;
     int64_t bytes_per_frame_;
 };
 

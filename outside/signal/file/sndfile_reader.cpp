@@ -1,11 +1,12 @@
 #include "outside/signal/file/sndfile_reader_internal.hpp"
 
+#include <fcntl.h>
 #include <sndfile.h>
 
 #include <algorithm>
 #include <cstring>
-#include <vector>
 #include <mutex>
+#include <vector>
 
 #include "outside/signal/file/direct_pcm_internal.hpp"
 #include "outside/signal/file/formats_internal.hpp"
@@ -143,6 +144,8 @@ private:
         auto direct = std::make_unique<DirectPcm>(fd_.get(), vfile_.file_offset(), format_.audioFormatKind,
                                                   format_.numChannels);
         if (second - vfile_.file_offset() != direct->bytes_per_frame()) return;
+        // Now the length is known exactly: the frames after the first one.
+        frames_ = std::min(frames_, (vfile_.file_size() - vfile_.file_offset()) / direct->bytes_per_frame());
         int64_t n = std::min<int64_t>(frames_, 1024);
         std::vector<float> theirs(static_cast<size_t>(n * format_.numChannels)), ours(theirs.size());
         if (sf_readf_float(sf_, theirs.data(), n) != n || direct->read(0, ours.data(), n) != n) return;
@@ -178,7 +181,7 @@ std::unique_ptr<FileReader> open_sndfile_reader(UniqueFd fd, int64_t size, const
     // "AUTO[sr=..,nc=..]": a file no header describes is read as headerless.
     if (error == AUDIO_ERROR_UNSUPPORTED_FORMAT && format.container == 0 && format.sample_rate && format.channels &&
         raw_info(format, &info)) {
-        UniqueFd again(dup(fd_number));
+        UniqueFd again(fcntl(fd_number, F_DUPFD_CLOEXEC, 0));
         if (!again) {
             set_last_error(AUDIO_ERROR_READ);
             return nullptr;

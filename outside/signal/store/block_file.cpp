@@ -29,23 +29,12 @@ int open_hidden_file(const std::string &folder)
     return fd2;
 }
 
-bool full_pwrite(int fd, const char *data, size_t size, off_t at)
+// Moves all of size bytes with pread or pwrite, going on after short transfers.
+template <typename Transfer>
+bool transfer_all(Transfer transfer, int fd, char *data, size_t size, off_t at)
 {
     while (size > 0) {
-        ssize_t n = ::pwrite(fd, data, size, at);
-        if (n < 0 && errno == EINTR) continue;
-        if (n <= 0) return false;
-        data += n;
-        size -= size_t(n);
-        at += n;
-    }
-    return true;
-}
-
-bool full_pread(int fd, char *data, size_t size, off_t at)
-{
-    while (size > 0) {
-        ssize_t n = ::pread(fd, data, size, at);
+        const ssize_t n = transfer(fd, data, size, at);
         if (n < 0 && errno == EINTR) continue;
         if (n <= 0) return false;
         data += n;
@@ -84,8 +73,9 @@ int64_t BlockFile::store(const float *samples, int64_t count)
             free_.pop_back();
         }
     }
-    if (!full_pwrite(fd_, reinterpret_cast<const char *>(samples), size_t(count) * sizeof(float),
-                     off_t(slot * kSlotBytes))) {
+    auto write = [](int fd, const char *data, size_t size, off_t at) { return ::pwrite(fd, data, size, at); };
+    if (!transfer_all(write, fd_, reinterpret_cast<char *>(const_cast<float *>(samples)),
+                      size_t(count) * sizeof(float), off_t(slot * kSlotBytes))) {
         release(slot);
         return -1;
     }
@@ -94,8 +84,8 @@ int64_t BlockFile::store(const float *samples, int64_t count)
 
 bool BlockFile::load(int64_t slot, int64_t first, int64_t count, float *out) const
 {
-    return full_pread(fd_, reinterpret_cast<char *>(out), size_t(count) * sizeof(float),
-                      off_t(slot * kSlotBytes + first * int64_t(sizeof(float))));
+    return transfer_all(::pread, fd_, reinterpret_cast<char *>(out), size_t(count) * sizeof(float),
+                        off_t(slot * kSlotBytes + first * int64_t(sizeof(float))));
 }
 
 void BlockFile::release(int64_t slot)

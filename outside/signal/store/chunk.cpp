@@ -1,5 +1,9 @@
 #include "outside/signal/store/chunk.hpp"
 
+#ifdef __SSE2__
+#include <immintrin.h>
+#endif
+
 #include <algorithm>
 #include <atomic>
 #include <cstring>
@@ -106,14 +110,57 @@ ChunkPtr store_in_block_file(const float *samples, int64_t count, std::vector<Mi
 
 }  // namespace
 
+void scan_frames(const float *frames, int64_t count, int channels, MinMax *out)
+{
+    for (int c = 0; c < channels; ++c) out[c] = MinMax::empty();
+    int64_t i = 0;
+#ifdef __SSE2__
+    // With 1, 2 or 4 channels every lane of four samples stays on one channel.
+    if (4 % channels == 0) {
+        __m128 vlo = _mm_set1_ps(__builtin_inff()), vhi = _mm_set1_ps(-__builtin_inff());
+        for (; (i + 4 / channels) <= count; i += 4 / channels) {
+            const __m128 x = _mm_loadu_ps(frames + i * channels);
+            vlo = _mm_min_ps(vlo, x);
+            vhi = _mm_max_ps(vhi, x);
+        }
+        alignas(16) float l[4], h[4];
+        _mm_store_ps(l, vlo);
+        _mm_store_ps(h, vhi);
+        for (int k = 0; k < 4; ++k) out[k % channels].add({l[k], h[k]});
+    }
+#endif
+    for (; i < count; ++i) {
+        for (int c = 0; c < channels; ++c) out[c].add({frames[i * channels + c], frames[i * channels + c]});
+    }
+}
+
 MinMax scan_minmax(const float *samples, int64_t count)
 {
-    float lo = __builtin_inff(), hi = -__builtin_inff();
-    for (int64_t i = 0; i < count; ++i) {
-        lo = std::min(lo, samples[i]);
-        hi = std::max(hi, samples[i]);
+    MinMax result;
+    scan_frames(samples, count, 1, &result);
+    return result;
+}
+
+MinMax merge_minmax(const MinMax *entries, int64_t count)
+{
+    MinMax result = MinMax::empty();
+    int64_t i = 0;
+#ifdef __SSE2__
+    // Two entries per register: lanes 0 and 2 hold minima, 1 and 3 maxima.
+    __m128 vlo = _mm_set1_ps(result.min), vhi = _mm_set1_ps(result.max);
+    static_assert(sizeof(MinMax) == 2 * sizeof(float), "entries are float pairs");
+    for (; i + 2 <= count; i += 2) {
+        const __m128 x = _mm_loadu_ps(&entries[i].min);
+        vlo = _mm_min_ps(vlo, x);
+        vhi = _mm_max_ps(vhi, x);
     }
-    return {lo, hi};
+    alignas(16) float l[4], h[4];
+    _mm_store_ps(l, vlo);
+    _mm_store_ps(h, vhi);
+    result = {std::min(l[0], l[2]), std::max(h[1], h[3])};
+#endif
+    for (; i < count; ++i) result.add(entries[i]);
+    return result;
 }
 
 std::vector<MinMax> summarize(const float *samples, int64_t count)
@@ -170,7 +217,7 @@ MinMax Chunk::minmax(int64_t a, int64_t b, WindowCache &cache) const
     if (first >= last) return raw_minmax(a, b, cache);
     MinMax result = MinMax::empty();
     if (a < first * kWindowFrames) result.add(raw_minmax(a, first * kWindowFrames, cache));
-    for (int64_t w = first; w < last; ++w) result.add(windows_[size_t(w)]);
+    result.add(merge_minmax(windows_.data() + first, last - first));
     if (last * kWindowFrames < b) result.add(raw_minmax(last * kWindowFrames, b, cache));
     return result;
 }

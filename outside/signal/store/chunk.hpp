@@ -10,8 +10,11 @@ namespace velmsig {
 
 class SampleSource;
 
-// Largest chunk, and the frames summarised by one window entry.
+// Largest chunk of new samples, largest chunk of a file read in place (it
+// holds no samples, so fewer, longer ones keep block lists short), and the
+// frames summarised by one window entry.
 constexpr int64_t kChunkFrames = 65536;
+constexpr int64_t kSourceChunkFrames = 1 << 20;
 constexpr int64_t kWindowFrames = 256;
 
 struct MinMax {
@@ -25,6 +28,10 @@ struct MinMax {
 };
 
 MinMax scan_minmax(const float *samples, int64_t count);
+// Extremes of each channel of count interleaved frames into out[channel].
+void scan_frames(const float *frames, int64_t count, int channels, MinMax *out);
+// The union of count summary entries.
+MinMax merge_minmax(const MinMax *entries, int64_t count);
 
 // The raw samples of one window, kept by a reader that scans forward so that
 // the window shared by two consecutive ranges is fetched once.

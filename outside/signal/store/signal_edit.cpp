@@ -94,6 +94,25 @@ bool bad_argument()
     return false;
 }
 
+// Gives every active channel the sequence make(channel, index) builds (index
+// counts the active channels); a null sequence is a read error that drops
+// the whole edit.
+template <typename Make>
+bool edit_active(Edit &edit, Make make)
+{
+    int index = 0;
+    for (int c = 0; c < edit.channels(); ++c) {
+        if (!edit.active(c)) continue;
+        SegmentsPtr next = make(c, index++);
+        if (!next) {
+            set_last_error(AUDIO_ERROR_READ);
+            return false;
+        }
+        edit.set(c, std::move(next));
+    }
+    return true;
+}
+
 // The source channel that feeds the i-th active channel of the target.
 int source_channel(int active_index, int source_channels)
 {
@@ -106,15 +125,13 @@ bool paste(_audio_signal &signal, const _audio_signal &source, int64_t begin, in
     Edit edit(signal);
     if (edit.active_count() == 0 || pasted.empty()) return bad_argument();
     clamp_range(edit.length(), begin, end);
-    int index = 0;
-    for (int c = 0; c < edit.channels(); ++c) {
-        if (!edit.active(c)) continue;
-        const Segments &from = *pasted[size_t(source_channel(index++, int(pasted.size())))];
-        edit.set(c, splice(edit.current(c), begin, end, [&](SegmentsBuilder &b) {
-                     b.append_range(from, 0, from.length());
-                     return true;
-                 }));
-    }
+    edit_active(edit, [&](int c, int index) {
+        const Segments &from = *pasted[size_t(source_channel(index, int(pasted.size())))];
+        return splice(edit.current(c), begin, end, [&](SegmentsBuilder &b) {
+            b.append_range(from, 0, from.length());
+            return true;
+        });
+    });
     edit.removed(begin, end - begin);
     edit.inserted(begin, pasted[0]->length());
     edit.commit();
@@ -189,10 +206,9 @@ int AUDIOSIGNAL_ClearEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t e
     if (!signal) return bad_argument();
     Edit edit(*signal);
     clamp_range(edit.length(), begin, end);
-    for (int c = 0; c < edit.channels(); ++c) {
-        if (!edit.active(c)) continue;
-        edit.set(c, splice(edit.current(c), begin, end, [](SegmentsBuilder &) { return true; }));
-    }
+    edit_active(edit, [&](int c, int) {
+        return splice(edit.current(c), begin, end, [](SegmentsBuilder &) { return true; });
+    });
     edit.removed(begin, end - begin);
     edit.commit();
     return 1;
@@ -215,12 +231,10 @@ int AUDIOSIGNAL_MixPasteEx(AUDIOSIGNAL *signal, AUDIOSIGNAL *source, int flags, 
     clamp_range(edit.length(), begin, end);
     const int64_t frames = end > begin ? std::min(end - begin, mixed[0]->length()) : mixed[0]->length();
     std::vector<float> under(size_t(std::min(frames, kChunkFrames)));
-    int index = 0;
-    for (int c = 0; c < edit.channels(); ++c) {
-        if (!edit.active(c)) continue;
+    const bool ok = edit_active(edit, [&](int c, int index) {
         const Segments &target = edit.current(c);
-        const Segments &from = *mixed[size_t(source_channel(index++, int(mixed.size())))];
-        SegmentsPtr result = splice(target, begin, begin + frames, [&](SegmentsBuilder &b) {
+        const Segments &from = *mixed[size_t(source_channel(index, int(mixed.size())))];
+        return splice(target, begin, begin + frames, [&](SegmentsBuilder &b) {
             return append_made(b, frames, [&](int64_t at, int64_t n, float *out) {
                 if (!from.read(at, n, out)) return false;
                 // The part of the piece still over the signal's samples.
@@ -232,12 +246,8 @@ int AUDIOSIGNAL_MixPasteEx(AUDIOSIGNAL *signal, AUDIOSIGNAL *source, int flags, 
                 return true;
             });
         });
-        if (!result) {
-            set_last_error(AUDIO_ERROR_READ);
-            return 0;
-        }
-        edit.set(c, result);
-    }
+    });
+    if (!ok) return 0;
     edit.commit();
     if (length) *length = frames;
     return 1;
@@ -248,13 +258,12 @@ int AUDIOSIGNAL_SilenceEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t
     if (!signal) return bad_argument();
     Edit edit(*signal);
     clamp_range(edit.length(), begin, end);
-    for (int c = 0; c < edit.channels(); ++c) {
-        if (!edit.active(c)) continue;
-        edit.set(c, splice(edit.current(c), begin, end, [&](SegmentsBuilder &b) {
-                     b.append_silence(end - begin);
-                     return true;
-                 }));
-    }
+    edit_active(edit, [&](int c, int) {
+        return splice(edit.current(c), begin, end, [&](SegmentsBuilder &b) {
+            b.append_silence(end - begin);
+            return true;
+        });
+    });
     edit.commit();
     return 1;
 }
@@ -264,22 +273,17 @@ int AUDIOSIGNAL_ReverseEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t
     if (!signal) return bad_argument();
     Edit edit(*signal);
     clamp_range(edit.length(), begin, end);
-    for (int c = 0; c < edit.channels(); ++c) {
-        if (!edit.active(c)) continue;
+    const bool ok = edit_active(edit, [&](int c, int) {
         const Segments &source = edit.current(c);
-        SegmentsPtr result = splice(source, begin, end, [&](SegmentsBuilder &b) {
+        return splice(source, begin, end, [&](SegmentsBuilder &b) {
             return append_made(b, end - begin, [&](int64_t at, int64_t n, float *out) {
                 if (!source.read(end - at - n, n, out)) return false;
                 std::reverse(out, out + n);
                 return true;
             });
         });
-        if (!result) {
-            set_last_error(AUDIO_ERROR_READ);
-            return 0;
-        }
-        edit.set(c, result);
-    }
+    });
+    if (!ok) return 0;
     edit.commit();
     return 1;
 }

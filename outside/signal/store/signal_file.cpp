@@ -1,8 +1,5 @@
 // Opening signals from files and saving them, through the file part's
 // readers and writers.
-#ifdef __SSE2__
-#include <immintrin.h>
-#endif
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -32,54 +29,16 @@ private:
     std::unique_ptr<FileReader> reader_;
 };
 
-// Extremes of window w of every channel into result, kept in registers.
-void summarize_window(const float *frames, int64_t begin, int64_t end, int channels, size_t w,
-                      std::vector<std::vector<MinMax>> &result)
-{
-    float lo[AUDIOSIGNAL_MAX_CHANNELS], hi[AUDIOSIGNAL_MAX_CHANNELS];
-    for (int c = 0; c < channels; ++c) {
-        lo[c] = __builtin_inff();
-        hi[c] = -__builtin_inff();
-    }
-    int64_t i = begin;
-#ifdef __SSE2__
-    // With 1, 2 or 4 channels every lane of four samples stays on one channel.
-    if (4 % channels == 0) {
-        __m128 vlo = _mm_set1_ps(__builtin_inff()), vhi = _mm_set1_ps(-__builtin_inff());
-        const float *p = frames + begin * channels, *stop = frames + end * channels;
-        for (; p + 4 <= stop; p += 4) {
-            const __m128 x = _mm_loadu_ps(p);
-            vlo = _mm_min_ps(vlo, x);
-            vhi = _mm_max_ps(vhi, x);
-        }
-        alignas(16) float l[4], h[4];
-        _mm_store_ps(l, vlo);
-        _mm_store_ps(h, vhi);
-        for (int k = 0; k < 4; ++k) {
-            lo[k % channels] = std::min(lo[k % channels], l[k]);
-            hi[k % channels] = std::max(hi[k % channels], h[k]);
-        }
-        i = (p - frames) / channels;
-    }
-#endif
-    for (; i < end; ++i) {
-        const float *frame = frames + i * channels;
-        for (int c = 0; c < channels; ++c) {
-            lo[c] = std::min(lo[c], frame[c]);
-            hi[c] = std::max(hi[c], frame[c]);
-        }
-    }
-    for (int c = 0; c < channels; ++c) result[size_t(c)][w] = {lo[c], hi[c]};
-}
-
 // Summaries of every channel of n interleaved frames, in one pass.
 std::vector<std::vector<MinMax>> summarize_frames(const float *frames, int64_t n, int channels)
 {
     const size_t windows = size_t((n + kWindowFrames - 1) / kWindowFrames);
     std::vector<std::vector<MinMax>> result(static_cast<size_t>(channels), std::vector<MinMax>(windows));
+    MinMax window[AUDIOSIGNAL_MAX_CHANNELS];
     for (size_t w = 0; w < windows; ++w) {
         const int64_t begin = int64_t(w) * kWindowFrames, end = std::min(n, begin + kWindowFrames);
-        summarize_window(frames, begin, end, channels, w, result);
+        scan_frames(frames + begin * channels, end - begin, channels, window);
+        for (int c = 0; c < channels; ++c) result[size_t(c)][w] = window[c];
     }
     return result;
 }
@@ -89,15 +48,15 @@ std::vector<std::vector<MinMax>> summarize_frames(const float *frames, int64_t n
 bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<SegmentsPtr> &result)
 {
     const int channels = source->channels();
-    const int64_t pieces = (source->frames() + kChunkFrames - 1) / kChunkFrames;
+    const int64_t pieces = (source->frames() + kSourceChunkFrames - 1) / kSourceChunkFrames;
     std::vector<std::vector<ChunkPtr>> chunks(static_cast<size_t>(channels),
                                              std::vector<ChunkPtr>(static_cast<size_t>(pieces)));
     std::atomic<int64_t> next{0};
     std::atomic<bool> failed{false};
     auto work = [&] {
-        std::vector<float> frames(size_t(kChunkFrames) * size_t(channels));
+        std::vector<float> frames(size_t(kSourceChunkFrames) * size_t(channels));
         for (int64_t k = next++; k < pieces && !failed; k = next++) {
-            const int64_t at = k * kChunkFrames, n = std::min(kChunkFrames, source->frames() - at);
+            const int64_t at = k * kSourceChunkFrames, n = std::min(kSourceChunkFrames, source->frames() - at);
             if (source->read(at, frames.data(), n) != n) {
                 failed = true;
                 return;

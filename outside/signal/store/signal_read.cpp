@@ -1,5 +1,6 @@
 // Reading samples, exact extremes and sums.
 #include <algorithm>
+#include <cstdlib>
 #include <cstring>
 
 #include "outside/signal/store/signal_internal.hpp"
@@ -92,21 +93,25 @@ int64_t AUDIOSIGNAL_GetMaskedSamplesWithStep(AUDIOSIGNAL *signal, uint32_t mask,
     // Frames until the signal's end in the direction of the step.
     const int64_t reach = step > 0 ? (length - 1 - first) / step + 1 : first / -int64_t(step) + 1;
     const int64_t frames = std::min(count, reach);
-    const int64_t last = first + (frames - 1) * step;
-    const int64_t low = std::min(first, last), span = std::max(first, last) - low + 1;
     const int width = __builtin_popcount(mask);
-
+    // Pieces of at most one chunk of frames keep the buffer small.
+    const int64_t piece = std::max<int64_t>(1, kChunkFrames / std::abs(step));
     thread_local std::vector<float> buffer;
-    buffer.resize(size_t(span));
-    int slot = 0;
-    for (size_t c = 0; c < segments.size(); ++c) {
-        if (!(mask >> c & 1u)) continue;
-        if (!segments[c]->read(low, span, buffer.data())) {
-            set_last_error(AUDIO_ERROR_READ);
-            return -1;
+    for (int64_t done = 0; done < frames; done += piece) {
+        const int64_t n = std::min(piece, frames - done);
+        const int64_t start = first + done * step, last = start + (n - 1) * step;
+        const int64_t low = std::min(start, last), span = std::max(start, last) - low + 1;
+        buffer.resize(size_t(span));
+        int slot = 0;
+        for (size_t c = 0; c < segments.size(); ++c) {
+            if (!(mask >> c & 1u)) continue;
+            if (!segments[c]->read(low, span, buffer.data())) {
+                set_last_error(AUDIO_ERROR_READ);
+                return -1;
+            }
+            float *to = out + done * width + slot++;
+            for (int64_t k = 0; k < n; ++k) to[k * width] = buffer[size_t(start + k * step - low)];
         }
-        for (int64_t k = 0; k < frames; ++k) out[k * width + slot] = buffer[size_t(first + k * step - low)];
-        ++slot;
     }
     return frames;
 }

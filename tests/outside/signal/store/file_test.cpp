@@ -73,6 +73,31 @@ TEST(SignalStoreFile, PcmIsReadInPlaceAndSurvivesTheFileGoing)
     AUDIOSIGNAL_Destroy(signal);
 }
 
+TEST(SignalStoreFile, EveryChannelCountGetsExactSummaries)
+{
+    for (int channels : {1, 3, 4}) {
+        const std::string path = temp_path("channels.wav");
+        const Channels expected =
+            write_file(path, random_channels(channels, 70001, uint32_t(46 + channels)), SF_FORMAT_WAV | SF_FORMAT_PCM_24);
+        AUDIOSIGNAL *signal = AUDIOSIGNAL_OpenEx(path.c_str(), "AUTO", 0, nullptr, nullptr);
+        ASSERT_NE(signal, nullptr);
+        for (int c = 0; c < channels; ++c) {
+            AUDIOPOINTER pointer;
+            AUDIOSIGNAL_InitAudioPointer(signal, &pointer, 3, c);
+            for (int64_t at = 3; at < 70001; at += 3001) {
+                float lo, hi;
+                const int64_t n = AUDIOSIGNAL_GetChannelMinMaxFromAudioPointer(signal, &pointer, 3001, &lo, &hi);
+                const auto [a, b] = std::minmax_element(expected[size_t(c)].begin() + at,
+                                                        expected[size_t(c)].begin() + at + n);
+                ASSERT_EQ(lo, *a) << channels << " channels, channel " << c << " at " << at;
+                ASSERT_EQ(hi, *b) << channels << " channels, channel " << c << " at " << at;
+            }
+        }
+        AUDIOSIGNAL_Destroy(signal);
+        unlink(path.c_str());
+    }
+}
+
 TEST(SignalStoreFile, CompressedFilesAreDecodedOnceOutOfMemory)
 {
     const std::string path = temp_path("coded.flac");

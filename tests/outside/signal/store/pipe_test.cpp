@@ -48,7 +48,8 @@ TEST(SignalStorePipe, ReadersSeeAConsistentSignalWhileRecording)
     std::atomic<bool> done{false};
     std::atomic<int> checks{0};
     // Sample i holds the value i, so any snapshot must read 0, 1, 2, ...
-    std::thread reader([&] {
+    std::atomic<bool> stopped{false};
+    auto look = [&] {
         std::vector<float> out;
         while (!done) {
             const int64_t n = AUDIOSIGNAL_NumSamples(signal);
@@ -63,11 +64,19 @@ TEST(SignalStorePipe, ReadersSeeAConsistentSignalWhileRecording)
             for (size_t i = 1; i < out.size(); ++i) ASSERT_EQ(out[i], out[i - 1] + 1.0f);
             ++checks;
         }
+    };
+    std::thread reader([&] {
+        look();
+        stopped = true;  // also when a check failed
     });
     std::vector<float> piece(1024);
     for (int64_t at = 0; at < 1 << 18; at += 1024) {
         for (int i = 0; i < 1024; ++i) piece[size_t(i)] = float(at + i);
         ASSERT_EQ(AUDIOSIGNAL_AppendToPipe(pipe, piece.data(), 1024), 1024);
+        // Let the reader look between appends now and then.
+        if (at % (32 * 1024) == 0) {
+            for (const int seen = checks; checks == seen && !stopped;) std::this_thread::yield();
+        }
     }
     done = true;
     reader.join();

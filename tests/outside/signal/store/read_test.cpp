@@ -45,6 +45,21 @@ TEST(SignalStoreRead, MaskedSamplesInterleaveTheChosenChannels)
     AUDIOSIGNAL_Destroy(signal);
 }
 
+TEST(SignalStoreRead, LongMaskedReadsInPieces)
+{
+    const Channels samples = random_channels(2, 300000, 6);
+    AUDIOSIGNAL *signal = make_signal(samples);
+    std::vector<float> out(2 * 300000);
+    ASSERT_EQ(AUDIOSIGNAL_GetMaskedSamples(signal, 0x3, 0, out.data(), int64_t(1) << 40), 300000);
+    for (size_t k = 0; k < 300000; k += 7) {
+        ASSERT_EQ(out[2 * k], samples[0][k]);
+        ASSERT_EQ(out[2 * k + 1], samples[1][k]);
+    }
+    ASSERT_EQ(AUDIOSIGNAL_GetMaskedSamplesWithStep(signal, 0x1, 299999, out.data(), 300000, -3), 100000);
+    for (size_t k = 0; k < 100000; ++k) ASSERT_EQ(out[k], samples[0][299999 - 3 * k]);
+    AUDIOSIGNAL_Destroy(signal);
+}
+
 TEST(SignalStoreRead, AudioPointerExtremesAreExact)
 {
     const Channels samples = random_channels(2, 400000, 3);
