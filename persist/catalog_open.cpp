@@ -80,7 +80,9 @@ bool is_sound_database(sqlite3 *db)
 
 bool create_schema(sqlite3 *db)
 {
-    if (!execute(db, "PRAGMA journal_mode=WAL;")) return false;
+    // Readers and the writer no longer block each other; with the write-ahead
+    // log, a crash may lose the last records but never damages the file.
+    if (!execute(db, "PRAGMA journal_mode=WAL;") || !execute(db, "PRAGMA synchronous=NORMAL;")) return false;
     for (const char *step : SCHEMA_STEPS) {
         if (!execute(db, step)) {
             sqlite3_exec(db, "ROLLBACK;", nullptr, nullptr, nullptr);
