@@ -171,4 +171,27 @@ TEST(SignalStoreBlocks, SharedChunksSplitTheirMemory)
     EXPECT_EQ(first->memory_share(), alone);
 }
 
+TEST(SignalStoreBlocks, EditsShareTheUntouchedPages)
+{
+    const std::vector<float> samples = random_samples(64 * 400, 11);
+    SegmentsBuilder builder;
+    for (int i = 0; i < 400; ++i) builder.append({make_chunk(samples.data() + 64 * i, 64), 0, 64});
+    SegmentsPtr sequence = builder.build();
+    ASSERT_GE(sequence->pages().size(), 400 / kPageParts);
+
+    // Remove a few frames in the middle.
+    SegmentsBuilder edit;
+    edit.append_range(*sequence, 0, 12800);
+    edit.append_range(*sequence, 12803, sequence->length());
+    SegmentsPtr edited = edit.build();
+    size_t shared = 0;
+    for (const PagePtr &page : edited->pages()) {
+        shared += std::count(sequence->pages().begin(), sequence->pages().end(), page);
+    }
+    EXPECT_GE(shared + 3, sequence->pages().size());
+    std::vector<float> reference(samples.begin(), samples.begin() + 12800);
+    reference.insert(reference.end(), samples.begin() + 12803, samples.end());
+    expect_matches(*edited, reference, 12);
+}
+
 }  // namespace
