@@ -147,7 +147,8 @@ typedef struct _audio_format_descr {
 /* Opaque audio file opened by AUDIO_LoadFile or AUDIO_CreateFileEx. */
 typedef struct _audio_file AUDIO_FILE;
 
-/* Start and stop the library: counted, the last Finalize releases its state. */
+/* Start and stop the library: counted; Finalize answers 0 when nothing was
+ * started.  The calls of this header work without them. */
 AUDIO_API int  AUDIO_Initialize(void);
 AUDIO_API int  AUDIO_Finalize(void);
 

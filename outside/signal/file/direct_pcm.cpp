@@ -15,7 +15,7 @@ namespace {
 
 int bytes_of(int coding) {
     switch (coding) {
-        case AUDIO_FORMAT_PCM_U8: return 1;
+        case AUDIO_FORMAT_PCM_U8: case AUDIO_FORMAT_PCM_S8: return 1;
         case AUDIO_FORMAT_PCM_16: return 2;
         case AUDIO_FORMAT_PCM_24: return 3;
         case AUDIO_FORMAT_PCM_32: case AUDIO_FORMAT_FLOAT: return 4;
@@ -71,11 +71,12 @@ void scale(const Sample *raw, float *out, int64_t n, float factor) {
 
 bool DirectPcm::handles(int coding) { return std::endian::native == std::endian::little && bytes_of(coding) > 0; }
 
-DirectPcm::DirectPcm(int fd, int64_t data_offset, int coding, int channels)
+DirectPcm::DirectPcm(int fd, int64_t data_offset, int coding, int channels, bool big_endian)
     : fd_(fd),
       data_offset_(data_offset),
       coding_(coding),
       channels_(channels),
+      big_endian_(big_endian),
       bytes_per_frame_(int64_t{bytes_of(coding)} * channels) {}
 
 int64_t DirectPcm::read(int64_t first, float *out, int64_t count) const {
@@ -88,9 +89,25 @@ int64_t DirectPcm::read(int64_t first, float *out, int64_t count) const {
             return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
                 for (int64_t i = 0; i < n; ++i) o[i] = static_cast<float>(raw[i] - 128) * (1.0f / 128);
             });
+        case AUDIO_FORMAT_PCM_S8:
+            return read(int8_t{}, [](const int8_t *raw, float *o, int64_t n) { scale(raw, o, n, 1.0f / 128); });
         case AUDIO_FORMAT_PCM_16:
+            if (big_endian_)
+                return read(uint16_t{}, [](const uint16_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i)
+                        o[i] = static_cast<float>(static_cast<int16_t>(__builtin_bswap16(raw[i]))) * (1.0f / 32768);
+                });
             return read(int16_t{}, [](const int16_t *raw, float *o, int64_t n) { scale(raw, o, n, 1.0f / 32768); });
         case AUDIO_FORMAT_PCM_24:
+            // The three bytes go to the top of a 32-bit word, then shift down
+            // keeping the sign.
+            if (big_endian_)
+                return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i, raw += 3) {
+                        auto v = static_cast<int32_t>(uint32_t{raw[0]} << 24 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 8);
+                        o[i] = static_cast<float>(v >> 8) * (1.0f / 8388608);
+                    }
+                });
             return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
                 for (int64_t i = 0; i < n; ++i, raw += 3) {
                     auto v = static_cast<int32_t>(uint32_t{raw[0]} << 8 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 24);
@@ -98,8 +115,17 @@ int64_t DirectPcm::read(int64_t first, float *out, int64_t count) const {
                 }
             });
         case AUDIO_FORMAT_PCM_32:
+            if (big_endian_)
+                return read(uint32_t{}, [](const uint32_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i)
+                        o[i] = static_cast<float>(static_cast<int32_t>(__builtin_bswap32(raw[i]))) * (1.0f / 2147483648.0f);
+                });
             return read(int32_t{}, [](const int32_t *raw, float *o, int64_t n) { scale(raw, o, n, 1.0f / 2147483648.0f); });
         default:  // floats are stored as they are
+            if (big_endian_)
+                return read(uint32_t{}, [](const uint32_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i) o[i] = std::bit_cast<float>(__builtin_bswap32(raw[i]));
+                });
             return read(float{}, [](const float *raw, float *o, int64_t n) { std::copy(raw, raw + n, o); });
     }
 }

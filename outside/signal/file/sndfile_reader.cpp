@@ -42,6 +42,14 @@ int bytes_per_sample(int coding) {
     }
 }
 
+// The byte order of a file's samples: libsndfile names it where it differs
+// from the container's own (little-endian AIFF and CAF, big-endian WAVE).
+bool big_endian(int sf_format, int container) {
+    int order = sf_format & SF_FORMAT_ENDMASK;
+    if (order != SF_ENDIAN_FILE) return order == SF_ENDIAN_BIG;  // the host's order is little-endian
+    return container == AUDIO_CONTAINER_AIFF || container == AUDIO_CONTAINER_CAF;
+}
+
 // The SF_INFO that opens a headerless file as the format string says.
 bool raw_info(const ParsedFormat &f, SF_INFO *info) {
     bool floating = f.coding == AUDIO_FORMAT_FLOAT;
@@ -84,10 +92,7 @@ public:
                                    : (size > INT64_MAX / kMaxFramesPerByte ? INT64_MAX : size * kMaxFramesPerByte);
         frames_ = std::min<int64_t>(info.frames, capacity);
         meta_ = metadata_from_sndfile(sf_);
-        if (random_ && (info.format & SF_FORMAT_ENDMASK) != SF_ENDIAN_BIG && DirectPcm::handles(coding) &&
-            (container == AUDIO_CONTAINER_WAVE || container == AUDIO_CONTAINER_RF64 ||
-             container == AUDIO_CONTAINER_W64 || container == AUDIO_CONTAINER_RAW))
-            enable_direct_reads();
+        if (random_ && DirectPcm::handles(coding)) enable_direct_reads(big_endian(info.format, container));
         return AUDIO_ERROR_NONE;
     }
 
@@ -136,13 +141,13 @@ private:
     // Where the samples start is where libsndfile seeks for frame 0; the
     // first frames must then read the same both ways before the direct path
     // is trusted.
-    void enable_direct_reads() {
+    void enable_direct_reads(bool big_endian) {
         if (sf_seek(sf_, 1, SEEK_SET) != 1) return;
         int64_t second = vfile_.file_offset();
         if (sf_seek(sf_, 0, SEEK_SET) != 0) return;
         next_ = 0;
         auto direct = std::make_unique<DirectPcm>(fd_.get(), vfile_.file_offset(), format_.audioFormatKind,
-                                                  format_.numChannels);
+                                                  format_.numChannels, big_endian);
         if (second - vfile_.file_offset() != direct->bytes_per_frame()) return;
         // Now the length is known exactly: the frames after the first one.
         frames_ = std::min(frames_, (vfile_.file_size() - vfile_.file_offset()) / direct->bytes_per_frame());

@@ -217,7 +217,8 @@ std::unique_ptr<FileWriter> create_at(const std::string &named, const _audio_for
 
     size_t slash = path.rfind('/');
     size_t name_at = slash == std::string::npos ? 0 : slash + 1;
-    std::string temp = path.substr(0, name_at) + "." + path.substr(name_at) + ".velmtmp-XXXXXX";
+    // The temporary name must fit where the target's did (255 bytes).
+    std::string temp = path.substr(0, name_at) + "." + path.substr(name_at, 200) + ".velmtmp-XXXXXX";
     UniqueFd fd(mkostemp(temp.data(), O_CLOEXEC));
     if (!fd) {
         set_last_error(error_of_errno(errno, AUDIO_ERROR_WRITE));

@@ -258,6 +258,14 @@ TEST(Save, ReplacesTheOldFileKeepingItsPermissions) {
     EXPECT_EQ(read_all(*reader), samples);
 }
 
+TEST(Save, TakesTheLongestFileNames) {
+    TempDir dir;
+    std::string path = dir.file(std::string(251, 'n') + ".wav");  // 255 bytes, the most a name holds
+    auto samples = test_signal(1, 100);
+    ASSERT_TRUE(save(path, pcm_format(8000, 1, 16), "AUTO", samples)) << AUDIOSIGNAL_GetLastError();
+    EXPECT_EQ(dir.entries().size(), 1u);
+}
+
 TEST(Save, ThroughASymbolicLinkReplacesTheFileItNames) {
     TempDir dir;
     std::string real = dir.file("real.wav"), link = dir.file("link.wav");
