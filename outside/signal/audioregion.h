@@ -140,7 +140,8 @@ AUDIO_API int AUDIOSIGNAL_CountRegions(AUDIOSIGNAL *signal, int64_t begin, int64
 AUDIO_API int AUDIOSIGNAL_GetRegions(AUDIOSIGNAL *signal, AUDIOREGION **array, int max,
                                      int64_t begin, int64_t end, uint32_t tracks,
                                      uint32_t skip_flags, AUDIOREGION_Filter filter);
-/* Regions that are not deleted and meet [begin, end] (samples), any track. */
+/* Regions that are not deleted and meet [begin, end] (samples; end <= begin:
+ * any time), any track. */
 AUDIO_API int AUDIOSIGNAL_CountVisibleRegions(AUDIOSIGNAL *signal, int64_t begin, int64_t end);
 AUDIO_API int AUDIOSIGNAL_GetVisibleRegions(AUDIOSIGNAL *signal, AUDIOREGION **array, int max,
                                             int64_t begin, int64_t end);

@@ -1,7 +1,7 @@
 // The AUDIOREGION_ calls.  Queries read the record they are given (a copy
 // answers with its own times); edits go to the region the record stands for
 // and refresh the given record afterwards.
-#include <cmath>
+#include <algorithm>
 #include <cstring>
 
 #include "outside/signal/region/region_internal.hpp"

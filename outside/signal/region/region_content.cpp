@@ -1,7 +1,5 @@
 // Between a region set and what region files hold: the regions to write,
 // and the regions read, with their track names turned into numbers.
-#include <algorithm>
-#include <cmath>
 #include <functional>
 #include <set>
 #include <unordered_map>
@@ -96,8 +94,10 @@ int RegionSet::import_content(const RegionFileContent &content, int forced_track
             r->length = rec.length;
         made[i] = r;
         ++added;
-        if (rec.parent >= 0 && size_t(rec.parent) < i && made[size_t(rec.parent)])
-            set_parent(r, made[size_t(rec.parent)]);
+        if (rec.parent >= 0 && size_t(rec.parent) < i && made[size_t(rec.parent)] &&
+            !set_parent(r, made[size_t(rec.parent)]))
+            problems->push_back("region " + std::to_string(i + 1) +
+                                " nested too deep, kept at the top");
     }
     return added;
 }

@@ -218,9 +218,10 @@ bool parse_seconds(std::string_view text, double *out)
 std::string format_seconds(double seconds, int decimals)
 {
     char buffer[64];
+    char *const end = buffer + sizeof buffer;
     const auto result = decimals < 0
-        ? std::to_chars(buffer, buffer + sizeof buffer, seconds)
-        : std::to_chars(buffer, buffer + sizeof buffer, seconds, std::chars_format::fixed, decimals);
+        ? std::to_chars(buffer, end, seconds)
+        : std::to_chars(buffer, end, seconds, std::chars_format::fixed, decimals);
     return std::string(buffer, result.ptr);
 }
 

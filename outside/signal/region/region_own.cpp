@@ -2,7 +2,8 @@
 //
 //   VELM-REGIONS<TAB>1
 //   track<TAB>number<TAB>name<TAB>label
-//   region<TAB>id<TAB>parent id or -<TAB>track<TAB>flags (hex)<TAB>begin<TAB>length<TAB>label<TAB>comment
+//   region<TAB>id<TAB>parent id or -<TAB>track<TAB>flags (hex)<TAB>begin<TAB>length
+//         <TAB>label<TAB>comment          (one line)
 //
 // Times are seconds written exactly.  Texts escape backslash, tab, line
 // feed and carriage return as \\ \t \n \r; a field of only \N is no text.

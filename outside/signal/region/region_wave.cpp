@@ -249,7 +249,8 @@ int read_wave_cues(const char *path, RegionFileContent *out)
         const auto *d = reinterpret_cast<const unsigned char *>(data.data());
         const size_t declared = data.size() >= 4 ? le32(d) : 0;
         const size_t present = data.size() >= 4 ? (data.size() - 4) / 24 : 0;
-        if (declared > present) out->problems.push_back("cue chunk holds fewer points than it says");
+        if (declared > present)
+            out->problems.push_back("cue chunk holds fewer points than it says");
         for (size_t i = 0; i < std::min(declared, present); ++i) {
             const unsigned char *e = d + 4 + 24 * i;
             cues.emplace_back(le32(e), le32(e + 20));

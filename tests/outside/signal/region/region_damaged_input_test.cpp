@@ -26,8 +26,8 @@ std::vector<std::pair<std::string, std::string>> valid_files(const ScratchDir &d
 
     // A WAV file to carry cues: a format chunk and a little silence.
     const std::string wav = dir.file("seed.wav");
-    std::string riff = std::string("RIFF") + std::string(4, '\0') + "WAVE" + "fmt " +
-                       std::string("\x10\0\0\0\x01\0\x01\0\x40\x1f\0\0\x80\x3e\0\0\x02\0\x10\0", 20) +
+    const std::string fmt("\x10\0\0\0\x01\0\x01\0\x40\x1f\0\0\x80\x3e\0\0\x02\0\x10\0", 20);
+    std::string riff = std::string("RIFF") + std::string(4, '\0') + "WAVE" + "fmt " + fmt +
                        "data" + std::string("\x40\0\0\0", 4) + std::string(64, '\0');
     const uint32_t size = uint32_t(riff.size() - 8);
     for (int i = 0; i < 4; ++i) riff[size_t(4 + i)] = char((size >> (8 * i)) & 0xFF);
@@ -71,7 +71,8 @@ TEST(DamagedRegionFiles, ReadingNeverLeavesRegionsOutsideTheSignal)
             host.frames = 8000;
             RegionSet set(&host);
             std::vector<std::string> problems;
-            const int error = velmsig::read_region_file(set, path.c_str(), format.c_str(), &problems);
+            const int error =
+                velmsig::read_region_file(set, path.c_str(), format.c_str(), &problems);
             if (error) {
                 EXPECT_EQ(set.size(), 0u) << format << " round " << round;
             }
