@@ -191,7 +191,8 @@ typedef struct _audio_pointer {
 AUDIO_API int     AUDIOSIGNAL_InitAudioPointer(AUDIOSIGNAL *signal, AUDIOPOINTER *pointer,
                                                int64_t start, int channel);
 /* Exact extremes of the next count samples; advances the pointer.  Returns
- * the samples covered (fewer at the end; then min = max = 0 when none). */
+ * the samples covered (fewer at the end; min = max = 0 when none), -1 for
+ * a pointer not made for this signal. */
 AUDIO_API int64_t AUDIOSIGNAL_GetChannelMinMaxFromAudioPointer(AUDIOSIGNAL *signal, AUDIOPOINTER *pointer,
                                                                int64_t count, float *min, float *max);
 /* Exact extremes of count samples from first; 1, or 0 when the range holds

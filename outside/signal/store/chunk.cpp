@@ -214,10 +214,15 @@ MinMax Chunk::minmax(int64_t a, int64_t b, WindowCache &cache) const
     const int64_t first = (a + kWindowFrames - 1) / kWindowFrames;
     const int64_t last = b == frames_ ? int64_t(windows_.size()) : b / kWindowFrames;
     if (first >= last) return raw_minmax(a, b, cache);
-    MinMax result = MinMax::empty();
-    if (a < first * kWindowFrames) result.add(raw_minmax(a, first * kWindowFrames, cache));
-    result.add(merge_minmax(windows_.data() + first, last - first));
-    if (last * kWindowFrames < b) result.add(raw_minmax(last * kWindowFrames, b, cache));
+    MinMax result = merge_minmax(windows_.data() + first, last - first);
+    // An edge window whose extremes lie within the result cannot change it:
+    // its samples are read only when it might.
+    auto edge = [&](int64_t window, int64_t from, int64_t to) {
+        const MinMax &bounds = windows_[size_t(window)];
+        if (bounds.min < result.min || bounds.max > result.max) result.add(raw_minmax(from, to, cache));
+    };
+    if (a < first * kWindowFrames) edge(first - 1, a, first * kWindowFrames);
+    if (last * kWindowFrames < b) edge(last, last * kWindowFrames, b);
     return result;
 }
 

@@ -129,7 +129,7 @@ void SegmentsBuilder::append_page(const PagePtr &page)
 {
     // A page that fits beside the loose slices joins them, so that edits do
     // not leave a trail of small pages.
-    if (open_.size() + page->parts().size() <= kPageParts) {
+    if (!open_.empty() && open_.size() + page->parts().size() <= kPageParts) {
         for (const Segment &s : page->parts()) append(s);
         return;
     }

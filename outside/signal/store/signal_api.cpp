@@ -100,7 +100,7 @@ AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags)
         return nullptr;
     }
     auto *copy = new _audio_signal;
-    std::lock_guard<std::mutex> guard(signal->lock);
+    std::unique_lock<std::mutex> guard(signal->lock);
     copy->format = signal->format;
     // Own sequences (sharing every page) so that each signal counts its share.
     for (const _audio_blocks_list *list : signal->lists) {
@@ -118,6 +118,7 @@ AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags)
     copy->format_text = signal->format_text;
     copy->file_size = signal->file_size;
     copy->metadata = signal->metadata ? AUDIOMETADATA_Duplicate(signal->metadata) : nullptr;
+    guard.unlock();  // the regions ask their signals for rate and length
     if (signal->regions) signal_regions(copy)->copy_from(*signal->regions);
     return copy;
 }
