@@ -1,7 +1,7 @@
 // Composite operations built on the table: tiling, single characters and the
 // picture frame around regions.
 #include "render/canvas/canvas_internal.h"
-#include "render/canvas/pictures_internal.h"
+#include "widgets/resources/velmresources.h"
 
 #include <algorithm>
 
@@ -43,14 +43,14 @@ int VELMCANVAS_DrawChar(VELMCANVAS canvas, int x, int y, char character, int min
 namespace {
 
 // Pastes a picture of the set, when the set is linked in.
-void PastePiece(VELMCANVAS canvas, VELMCANVASIMAGE *piece, int x, int y)
+void PastePiece(VELMCANVAS canvas, VELMCANVASIMAGE piece, int x, int y)
 {
-    if (piece) VELMCANVAS_PasteImage(canvas, *piece, x, y);
+    if (piece) VELMCANVAS_PasteImage(canvas, piece, x, y);
 }
 
-void PastePieceScaled(VELMCANVAS canvas, VELMCANVASIMAGE *piece, int x, int y, int width, int height)
+void PastePieceScaled(VELMCANVAS canvas, VELMCANVASIMAGE piece, int x, int y, int width, int height)
 {
-    if (piece) VELMCANVAS_PasteImageScaled(canvas, *piece, x, y, width, height);
+    if (piece) VELMCANVAS_PasteImageScaled(canvas, piece, x, y, width, height);
 }
 
 } // namespace
@@ -63,24 +63,24 @@ int VELMCANVAS_BevelRect(VELMCANVAS canvas, int x, int y, int width, int height)
     const int side_height = height - 17;
     if (width > 12) {
         const int right = x + width - 6;
-        PastePiece(canvas, &Img_RegionRoundTopLeftOpen, x - 6, y - 3);
-        PastePieceScaled(canvas, &Img_RegionRoundLeftOpen, x - 6, y + 9, 12, side_height);
-        PastePiece(canvas, &Img_RegionRoundBottomLeftOpen, x - 6, bottom);
-        PastePiece(canvas, &Img_RegionRoundTopRightOpen, right, y - 3);
-        PastePieceScaled(canvas, &Img_RegionRoundRightOpen, right, y + 9, 12, side_height);
-        PastePiece(canvas, &Img_RegionRoundBottomRightOpen, right, bottom);
-        PastePieceScaled(canvas, &Img_RegionRectTopOpen, x + 6, y - 3, width - 12, 12);
-        PastePieceScaled(canvas, &Img_RegionRectBottomOpen, x + 6, bottom, width - 12, 16);
+        PastePiece(canvas, Img_RegionRoundTopLeftOpen, x - 6, y - 3);
+        PastePieceScaled(canvas, Img_RegionRoundLeftOpen, x - 6, y + 9, 12, side_height);
+        PastePiece(canvas, Img_RegionRoundBottomLeftOpen, x - 6, bottom);
+        PastePiece(canvas, Img_RegionRoundTopRightOpen, right, y - 3);
+        PastePieceScaled(canvas, Img_RegionRoundRightOpen, right, y + 9, 12, side_height);
+        PastePiece(canvas, Img_RegionRoundBottomRightOpen, right, bottom);
+        PastePieceScaled(canvas, Img_RegionRectTopOpen, x + 6, y - 3, width - 12, 12);
+        PastePieceScaled(canvas, Img_RegionRectBottomOpen, x + 6, bottom, width - 12, 16);
     } else {
         const int right = x + width - 2;
-        PastePiece(canvas, &Img_RegionRectTopLeft, x, y - 3);
-        PastePieceScaled(canvas, &Img_RegionRectLeft, x, y + 9, 2, side_height);
-        PastePiece(canvas, &Img_RegionRectBottomLeft, x, bottom);
-        PastePiece(canvas, &Img_RegionRectTopRight, right, y - 3);
-        PastePieceScaled(canvas, &Img_RegionRectRight, right, y + 9, 2, side_height);
-        PastePiece(canvas, &Img_RegionRectBottomRight, right, bottom);
-        PastePieceScaled(canvas, &Img_RegionRectTopOpen, x + 2, y - 3, width - 4, 12);
-        PastePieceScaled(canvas, &Img_RegionRectBottomOpen, x + 2, bottom, width - 4, 16);
+        PastePiece(canvas, Img_RegionRectTopLeft, x, y - 3);
+        PastePieceScaled(canvas, Img_RegionRectLeft, x, y + 9, 2, side_height);
+        PastePiece(canvas, Img_RegionRectBottomLeft, x, bottom);
+        PastePiece(canvas, Img_RegionRectTopRight, right, y - 3);
+        PastePieceScaled(canvas, Img_RegionRectRight, right, y + 9, 2, side_height);
+        PastePiece(canvas, Img_RegionRectBottomRight, right, bottom);
+        PastePieceScaled(canvas, Img_RegionRectTopOpen, x + 2, y - 3, width - 4, 12);
+        PastePieceScaled(canvas, Img_RegionRectBottomOpen, x + 2, bottom, width - 4, 16);
     }
     return 1;
 }

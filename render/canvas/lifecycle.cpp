@@ -1,7 +1,7 @@
 // Creating, growing and destroying canvases; the Qt entry points.
 #include "outside/base/blbase.h"
 #include "render/canvas/canvas_internal.h"
-#include "render/canvas/pictures_internal.h"
+#include "widgets/resources/velmresources.h"
 #include "render/canvas/qt/qtcanvas_internal.h"
 
 #include <algorithm>
@@ -30,7 +30,7 @@ VELMCANVAS VELMCANVAS_CreateCanvas(const _VELMCANVASOPS *ops, void *native, int 
 VELMCANVAS VELMCANVAS_CreateCanvasQT(void *native, int width, int height)
 {
     VELMCANVAS canvas = VELMCANVAS_CreateCanvas(&velm::canvas::qt::Operations(), native, width, height);
-    if (canvas && VELMRESOURCES_Load) VELMRESOURCES_Load();
+    if (canvas) VELMRESOURCES_Load();
     return canvas;
 }
 

@@ -1,7 +1,8 @@
-// The region frame of VELMCANVAS_BevelRect.  The library reaches the
-// picture set weakly, so this executable supplies its own set: the frame's
-// geometry shows in the recorded pastes.
+// The region frame of VELMCANVAS_BevelRect.  The test lends the library's
+// picture handles its own pieces, so the frame's geometry shows in the
+// recorded pastes.
 #include "render/canvas/recording_backend.h"
+#include "widgets/resources/velmresources.h"
 
 #include <gtest/gtest.h>
 
@@ -22,28 +23,38 @@ FakeImage round_top_left{"RoundTopLeftOpen", 12, 12}, round_left{"RoundLeftOpen"
 
 } // namespace
 
-extern "C" {
-#define PICTURE __attribute__((visibility("default"))) VELMCANVASIMAGE
-PICTURE Img_RegionRoundTopLeftOpen = AsImage(round_top_left);
-PICTURE Img_RegionRoundLeftOpen = AsImage(round_left);
-PICTURE Img_RegionRoundBottomLeftOpen = AsImage(round_bottom_left);
-PICTURE Img_RegionRoundTopRightOpen = AsImage(round_top_right);
-PICTURE Img_RegionRoundRightOpen = AsImage(round_right);
-PICTURE Img_RegionRoundBottomRightOpen = AsImage(round_bottom_right);
-PICTURE Img_RegionRectTopOpen = AsImage(rect_top_open);
-PICTURE Img_RegionRectBottomOpen = AsImage(rect_bottom_open);
-PICTURE Img_RegionRectTopLeft = AsImage(rect_top_left);
-PICTURE Img_RegionRectLeft = AsImage(rect_left);
-PICTURE Img_RegionRectBottomLeft = AsImage(rect_bottom_left);
-PICTURE Img_RegionRectTopRight = AsImage(rect_top_right);
-PICTURE Img_RegionRectRight = AsImage(rect_right);
-PICTURE Img_RegionRectBottomRight = AsImage(rect_bottom_right);
-#undef PICTURE
-}
+// Puts the test's pieces in the library's picture handles for one test.
+struct Bevel : velm::test::RecordingCanvas {
+    struct Piece {
+        VELMCANVASIMAGE *handle;
+        FakeImage *image;
+        VELMCANVASIMAGE saved = nullptr;
+    };
+    Piece pieces[14] = {
+        {&Img_RegionRoundTopLeftOpen, &round_top_left},       {&Img_RegionRoundLeftOpen, &round_left},
+        {&Img_RegionRoundBottomLeftOpen, &round_bottom_left}, {&Img_RegionRoundTopRightOpen, &round_top_right},
+        {&Img_RegionRoundRightOpen, &round_right},            {&Img_RegionRoundBottomRightOpen, &round_bottom_right},
+        {&Img_RegionRectTopOpen, &rect_top_open},             {&Img_RegionRectBottomOpen, &rect_bottom_open},
+        {&Img_RegionRectTopLeft, &rect_top_left},             {&Img_RegionRectLeft, &rect_left},
+        {&Img_RegionRectBottomLeft, &rect_bottom_left},       {&Img_RegionRectTopRight, &rect_top_right},
+        {&Img_RegionRectRight, &rect_right},                  {&Img_RegionRectBottomRight, &rect_bottom_right},
+    };
+    void SetUp() override
+    {
+        velm::test::RecordingCanvas::SetUp();
+        for (Piece &p : pieces) {
+            p.saved = *p.handle;
+            *p.handle = AsImage(*p.image);
+        }
+    }
+    void TearDown() override
+    {
+        for (Piece &p : pieces) *p.handle = p.saved;
+        velm::test::RecordingCanvas::TearDown();
+    }
+};
 
 namespace {
-
-using Bevel = velm::test::RecordingCanvas;
 
 TEST_F(Bevel, WideRegionsGetRoundedPiecesAroundThem)
 {
