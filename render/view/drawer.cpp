@@ -53,8 +53,7 @@ int VELMDRAW_Destroy(VELMDRAW drawer)
         destroy_wave_data(drawer->pool, lane.wave);
         destroy_spectral_data(lane.spectral);
     }
-    if (drawer->canvas && VELMCANVAS_GetDrawObject(drawer->canvas) == drawer)
-        VELMCANVAS_SetDrawObject(drawer->canvas, nullptr);
+    // The canvas belongs to the host and may already be gone: not touched.
     if (drawer->state) VELMSTATE_Destroy(drawer->state);
     MutexDestroy(drawer->lock);
     BLMEM_DisposeMemDescr(drawer->pool);

@@ -34,9 +34,10 @@ struct DataKey {
 
 struct WaveData {
     float   *first = nullptr;    // digital: column minimum; analog: spline value
-    float   *second = nullptr;   // digital: column maximum; analog: the view's samples
+    float   *second = nullptr;   // digital: column maximum; analog: the samples from view start - 10
     int32_t  analog = 0;
-    int32_t  capacity = 0;
+    int32_t  capacity = 0;       // columns; second holds capacity + 2 * kSplineMargin values
+    int32_t  samples = 0;        // analog: samples held in second
     DataKey  key;
     int32_t  polygonCapacity = 0;
     int32_t *polygonX = nullptr, *polygonY = nullptr;
@@ -113,6 +114,8 @@ struct RectList {
 };
 
 constexpr int kMaxLanes = 3 * VELMDRAW_MAX_CHANNELS;
+// Samples read on each side of the view for the spline (analog mode).
+constexpr int kSplineMargin = 10;
 
 // Steps of the frame that later parts of the renderer draw (scales and
 // overlays).  A null entry draws nothing.
@@ -156,6 +159,8 @@ int move_spectral_data(SpectralData *data, int from, int to, int count);
 // Workers: at most one per lane; joined before any lane is drawn.  An order
 // of more than `threshold` columns runs in a worker, a smaller one at once.
 int run_order(VELMDRAW drawer, Lane *lane, int first, int last, int threshold, BLTHREAD_Body body);
+// Waits for the lane's worker, if any, so its data may be read.
+void finish_worker(Lane *lane);
 void join_workers(VELMDRAW drawer);
 
 // Whether a lane's data still belong to its time base and the document.
@@ -190,7 +195,7 @@ struct _VELMDRAW {
     VELMDRAWCONFIG config{};
     BLMUTEX      lock = nullptr;
     uint8_t      laidOut = 0;
-    uint64_t     spectralGeneration = 0;
+    uint64_t     drawnChangeTime = 0;   // the document's change stamp of the last frame
 };
 
 #endif

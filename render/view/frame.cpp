@@ -210,12 +210,16 @@ int VELMDRAW_UpdateViewWindow(VELMDRAW d)
     offset_time_base(&base, static_cast<int>(k), static_cast<double>(s->viewBegin), static_cast<double>(s->viewEnd),
                      AUDIOSIGNAL_NumSamples(d->document->signal));
     const int shift = static_cast<int>(k);
+    // Besides the new columns, the column beside them and the two at each
+    // end are drawn again: their outline joined other neighbours before.
     if (shift > 0) {
         ok &= VELMDRAW_MoveAudioCanvas(d, shift, 0, columns - shift);
-        ok &= draw_columns(d, columns - shift, columns - 1, true);
+        ok &= draw_columns(d, std::max(columns - shift - 1, 0), columns - 1, true);
+        ok &= draw_columns(d, 0, 1, true);
     } else {
         ok &= VELMDRAW_MoveAudioCanvas(d, 0, -shift, columns + shift);
-        ok &= draw_columns(d, 0, -shift - 1, true);
+        ok &= draw_columns(d, 0, std::min(-shift, columns - 1), true);
+        ok &= draw_columns(d, columns - 2, columns - 1, true);
     }
     return ok;
 }
@@ -239,6 +243,10 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
         mask = VELMSTATE_EvalChanges(d->document, copy, old);
     }
     mask |= copy->changes;
+    // An edit changes the samples under an unchanged view.
+    const uint64_t change_time = VELMAUDIO_GetChangeTime(d->document);
+    if (change_time != d->drawnChangeTime) mask |= 0x80000000u;
+    d->drawnChangeTime = change_time;
     const bool size_changed = !old || old->drawWidth != copy->drawWidth || old->drawHeight != copy->drawHeight;
     if (!old || !d->laidOut) mask |= kEverything;
 

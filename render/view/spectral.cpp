@@ -207,6 +207,7 @@ int move_spectral_data(SpectralData *s, int from, int to, int count)
 
 int process_spectral(VELMDRAW d, Lane *lane, int first, int last)
 {
+    finish_worker(lane);
     SpectralData *s = lane->spectral;
     if (!s || !lane->timeBase->positions || lane->timeBase->count >= s->capacity) return 0;
     last = std::min(last, lane->timeBase->count - 1);

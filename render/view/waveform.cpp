@@ -57,16 +57,20 @@ void *analog_body(void *arguments)
     w->key = key_for(base, order->changeTime);
     const auto s0 = static_cast<int64_t>(lane->viewStart);
     const auto length = static_cast<int64_t>(lane->viewLength);
-    const int64_t n = length + 20;
+    const int64_t n = std::min<int64_t>(length + 2 * kSplineMargin, w->capacity + 2 * kSplineMargin);
     std::vector<float> xs(static_cast<size_t>(n)), ys(static_cast<size_t>(n)), d2(static_cast<size_t>(n));
     for (int64_t k = 0; k < n; ++k)
-        xs[static_cast<size_t>(k)] = static_cast<float>(VELMDRAW_TBConvertRealXtoDisplayX(base, static_cast<double>(s0 - 10 + k)));
-    AUDIOSIGNAL_GetChannelSamples(order->drawer->document->signal, lane->channel, s0 - 10, ys.data(), n);
+        xs[static_cast<size_t>(k)] =
+            static_cast<float>(VELMDRAW_TBConvertRealXtoDisplayX(base, static_cast<double>(s0 - kSplineMargin + k)));
+    AUDIOSIGNAL_GetChannelSamples(order->drawer->document->signal, lane->channel, s0 - kSplineMargin, ys.data(), n);
     if (DSPBSPLINE_Estimate(xs.data(), ys.data(), n, 0.0, 0.0, d2.data())) {
         for (int c = 0; c < base->count && c < w->capacity; ++c)
             w->first[c] = DSPBSPLINE_Interpolate(xs.data(), ys.data(), d2.data(), n, c);
     }
-    std::copy_n(ys.begin() + 10, std::min<int64_t>(length, w->capacity), w->second);
+    // All the samples read, so that dots just outside the view are drawn
+    // as a scrolled picture would show them.
+    std::copy_n(ys.begin(), n, w->second);
+    w->samples = static_cast<int32_t>(n);
     if (order->threaded) ThreadChildNotifyExit(0);
     return nullptr;
 }
@@ -80,15 +84,20 @@ void draw_envelope(VELMDRAW d, const Lane &lane, int first, int last, uint32_t f
 {
     WaveData *w = lane.wave;
     const int k = last - first + 1;
-    const int count = std::min(2 * (k + 2), w->polygonCapacity);
+    const int count = std::min(2 * (k + 4), w->polygonCapacity);
     const int half = count / 2;
     int *x = w->polygonX, *y = w->polygonY;
     const int32_t left = lane.area.left, top = lane.area.top;
-    // Top half left to right, bottom half back, each closed one pixel
-    // outside the columns.
+    // Top half left to right, bottom half back.  Each end reaches two
+    // pixels outside the columns: first the neighbour column's values (where
+    // there is one), then the closing point at the same heights, so that
+    // a strip drawn alone joins its neighbours exactly as a whole lane would
+    // and the closing line stays outside the clip.
+    const int computed = w->key.count;
     for (int j = 0; j < half; ++j) {
-        const int c = std::clamp(first + j - 1, first, last);
-        x[j] = left + first + j - 1;
+        const int column = first + j - 2;
+        const int c = std::clamp(std::clamp(column, first - 1, last + 1), 0, computed - 1);
+        x[j] = left + column;
         y[j] = top + value_row(lane, w->first[c]);
         x[count - 1 - j] = x[j];
         y[count - 1 - j] = top + value_row(lane, w->second[c]);
@@ -99,6 +108,10 @@ void draw_envelope(VELMDRAW d, const Lane &lane, int first, int last, uint32_t f
 void draw_curve(VELMDRAW d, const Lane &lane, int first, int last)
 {
     WaveData *w = lane.wave;
+    // One column more on each side: the clip keeps the strip, the curve
+    // enters it as it would in a whole lane.
+    first = std::max(first - 1, 0);
+    last = std::min(last + 1, w->key.count - 1);
     const int count = std::min(last - first + 1, w->polygonCapacity);
     for (int j = 0; j < count; ++j) {
         w->polygonX[j] = lane.area.left + first + j;
@@ -116,9 +129,11 @@ void draw_sample_dots(VELMDRAW d, const Lane &lane, int first, int last, uint32_
     const int size = spacing >= 17 ? 7 : 5;
     VELMCANVAS_SelectColor(d->canvas, fill);
     if (size == 7) VELMCANVAS_SelectShadowColor(d->canvas, fill);
-    for (int64_t j = 0; j < std::min<int64_t>(length, lane.wave->capacity); ++j) {
-        const auto x = static_cast<int>(VELMDRAW_TBConvertRealXtoDisplayX(lane.timeBase, lane.viewStart + static_cast<double>(j)));
-        if (x < first || x > last) continue;
+    // Dots centred just outside the columns still reach into them.
+    for (int j = 0; j < lane.wave->samples; ++j) {
+        const double sample = lane.viewStart - kSplineMargin + j;
+        const auto x = static_cast<int>(std::floor(VELMDRAW_TBConvertRealXtoDisplayX(lane.timeBase, sample)));
+        if (x < first - size || x > last + size) continue;
         const int32_t y = value_row(lane, lane.wave->second[j]);
         VELMCANVAS_FillRect(d->canvas, lane.area.left + x - size / 2, lane.area.top + y - size / 2, size, size,
                             static_cast<uint32_t>(size - 1));
@@ -134,8 +149,9 @@ WaveData *create_wave_data(BLMEM pool, WaveData *old, int capacity)
 {
     if (old && old->capacity >= capacity) return old;
     destroy_wave_data(pool, old);
-    const size_t polygon = 2 * (static_cast<size_t>(capacity) + 2);
-    const size_t bytes = sizeof(WaveData) + 2 * sizeof(float) * static_cast<size_t>(capacity) + 2 * sizeof(int32_t) * polygon;
+    const size_t polygon = 2 * (static_cast<size_t>(capacity) + 4);
+    const size_t values = static_cast<size_t>(capacity);
+    const size_t bytes = sizeof(WaveData) + sizeof(float) * (2 * values + 2 * kSplineMargin) + 2 * sizeof(int32_t) * polygon;
     auto *block = static_cast<unsigned char *>(BLMEM_New(pool, bytes));
     if (!block) return nullptr;
     auto *w = new (block) WaveData;
@@ -143,7 +159,7 @@ WaveData *create_wave_data(BLMEM pool, WaveData *old, int capacity)
     w->first = reinterpret_cast<float *>(block + sizeof(WaveData));
     w->second = w->first + capacity;
     w->polygonCapacity = static_cast<int32_t>(polygon);
-    w->polygonX = reinterpret_cast<int32_t *>(w->second + capacity);
+    w->polygonX = reinterpret_cast<int32_t *>(w->second + capacity + 2 * kSplineMargin);
     w->polygonY = w->polygonX + polygon;
     return w;
 }
@@ -163,6 +179,7 @@ int move_wave_data(WaveData *data, int from, int to, int count)
 
 int process_wave(VELMDRAW d, Lane *lane, int first, int last)
 {
+    finish_worker(lane);
     WaveData *w = lane->wave;
     if (!w || !lane->timeBase->positions || lane->timeBase->count > w->capacity) return 0;
     last = std::min(last, lane->timeBase->count - 1);
@@ -185,15 +202,15 @@ int draw_wave(VELMDRAW d, Lane *lane, int first, int last)
     WaveData *w = lane->wave;
     last = std::min(last, w ? w->key.count - 1 : -1);
     if (!w || last <= first) return 1;
+    const _VELMRECT clip = make_rect(a.left + first, a.top, last - first + 1, a.height);
     if (!w->analog) {
-        const _VELMRECT clip = make_rect(a.left + first, a.top, last - first + 1, a.height);
         VELMCANVAS_SetDrawArea(d->canvas, &clip);
         VELMCANVAS_SelectColor(d->canvas, outline);
         draw_envelope(d, *lane, first, last, fill);
         VELMCANVAS_ClearDrawArea(d->canvas);
         return 1;
     }
-    VELMCANVAS_SetDrawArea(d->canvas, &a);
+    VELMCANVAS_SetDrawArea(d->canvas, &clip);
     VELMCANVAS_SelectColor(d->canvas, outline);
     draw_curve(d, *lane, first, last);
     if (lane->kind == VELMDRAW_LANE_WAVEFORM) draw_sample_dots(d, *lane, first, last, fill);

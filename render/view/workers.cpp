@@ -5,13 +5,17 @@
 
 namespace velm::view {
 
+void finish_worker(Lane *lane)
+{
+    if (!lane->worker) return;
+    BLTHREAD_EndThread(lane->worker, 1);
+    lane->worker = nullptr;
+}
+
 int run_order(VELMDRAW drawer, Lane *lane, int first, int last, int threshold, BLTHREAD_Body body)
 {
     // The previous worker still reads the order: end it before rewriting.
-    if (lane->worker) {
-        BLTHREAD_EndThread(lane->worker, 1);
-        lane->worker = nullptr;
-    }
+    finish_worker(lane);
     lane->order = WorkOrder{drawer, lane, first, last, 0, VELMAUDIO_GetChangeTime(drawer->document)};
     if (last - first <= threshold) {
         body(&lane->order);
@@ -24,11 +28,7 @@ int run_order(VELMDRAW drawer, Lane *lane, int first, int last, int threshold, B
 
 void join_workers(VELMDRAW drawer)
 {
-    for (Lane &lane : drawer->lanes) {
-        if (!lane.worker) continue;
-        BLTHREAD_EndThread(lane.worker, 1);
-        lane.worker = nullptr;
-    }
+    for (Lane &lane : drawer->lanes) finish_worker(&lane);
 }
 
 } // namespace velm::view
