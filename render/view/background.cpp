@@ -1,7 +1,5 @@
 // The slow picture around the lanes: view background, buttons, frame and
 // navigator shadows, borders and separators.
-#include <cstdio>
-
 #include "core/document_internal.hpp"
 #include "render/view/drawer_internal.hpp"
 
@@ -16,10 +14,7 @@ bool on(uint32_t flags, uint32_t bit)
 
 void select_font(VELMCANVAS canvas, const VELMCONFIGFONT &config, uint32_t color)
 {
-    _VELMCANVASFONT font{};
-    std::snprintf(font.name, sizeof font.name, "%s", config.familyName);
-    font.size = config.size;
-    font.style = static_cast<uint32_t>(config.properties);
+    const _VELMCANVASFONT font = canvas_font(config);
     VELMCANVAS_SelectFont(canvas, &font);
     VELMCANVAS_SelectFontColor(canvas, color);
 }

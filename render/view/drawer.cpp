@@ -22,6 +22,15 @@ _VELMRECT make_rect(int32_t left, int32_t top, int32_t width, int32_t height)
     return _VELMRECT{left, top, width, height, left + width - 1, top + height - 1};
 }
 
+_VELMCANVASFONT canvas_font(const VELMCONFIGFONT &config)
+{
+    _VELMCANVASFONT font{};
+    std::snprintf(font.name, sizeof font.name, "%s", config.familyName);
+    font.size = config.size;
+    font.style = static_cast<uint32_t>(config.properties);
+    return font;
+}
+
 } // namespace velm::view
 
 VELMDRAW VELMDRAW_Create(VELMAUDIO doc)
@@ -169,10 +178,8 @@ int32_t VELMDRAW_CustomTrackHeight(VELMDRAW drawer, int track)
     if (!drawer || !drawer->canvas || !drawer->state || track < 0 || track >= VELM_MAX_CUSTOM_TRACKS) return 0;
     const VELMTRACKDISPLAY &t = drawer->state->tracks[track];
     const VELMCONFIGFONT &source = t.options & 0x10000 ? drawer->config.phoneticTextFont : drawer->config.regionTextFont;
-    _VELMCANVASFONT font{};
-    std::snprintf(font.name, sizeof font.name, "%s", source.familyName);
-    font.size = t.fontSize > 0.0f ? t.fontSize : source.size;
-    font.style = static_cast<uint32_t>(source.properties);
+    _VELMCANVASFONT font = canvas_font(source);
+    if (t.fontSize > 0.0f) font.size = t.fontSize;
     VELMCANVAS_SelectFont(drawer->canvas, &font);
     const int text = VELMCANVAS_TextHeight(drawer->canvas, "\xE5pple");
     return std::max(static_cast<int32_t>((0.5 + t.lineCount) * text), t.minimumHeight);

@@ -131,6 +131,8 @@ DrawHooks &draw_hooks();
 
 // Small rectangle helpers.
 _VELMRECT make_rect(int32_t left, int32_t top, int32_t width, int32_t height);
+// The canvas font record of a configured font.
+_VELMCANVASFONT canvas_font(const VELMCONFIGFONT &config);
 
 // Time bases.
 bool prepare_time_base(VELMTIMEBASE *base, double start, double end, int columns, int64_t signal_length);

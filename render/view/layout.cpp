@@ -2,7 +2,6 @@
 // custom tracks and scale areas, from the view state's size and flags.
 #include <algorithm>
 #include <cmath>
-#include <cstdio>
 
 #include "core/document_internal.hpp"
 #include "render/view/drawer_internal.hpp"
@@ -22,7 +21,6 @@ void build_lanes(VELMDRAW d)
 {
     const int channels = std::min(AUDIOSIGNAL_NumChannels(d->document->signal), VELMDRAW_MAX_CHANNELS);
     if (channels == d->channels && d->laneCount == 3 * channels) return;
-    join_workers(d);
     for (Lane &lane : d->lanes) {
         destroy_wave_data(d->pool, lane.wave);
         destroy_spectral_data(lane.spectral);
@@ -68,11 +66,7 @@ void place_buttons(VELMDRAW d, int32_t left, int32_t top)
 {
     static const char *const labels[3] = {"Wave Form", "Spectrogram", "Wave Form & Spectrogram"};
     const bool has_samples = AUDIOSIGNAL_NumSamples(d->document->signal) > 0;
-    const VELMCONFIGFONT &config = d->config.selectorFont;
-    _VELMCANVASFONT font{};
-    std::snprintf(font.name, sizeof font.name, "%s", config.familyName);
-    font.size = config.size;
-    font.style = static_cast<uint32_t>(config.properties);
+    const _VELMCANVASFONT font = canvas_font(d->config.selectorFont);
     if (d->canvas) VELMCANVAS_SelectFont(d->canvas, &font);
     for (int i = 0; i < 3; ++i) {
         ViewButton &b = d->buttons[static_cast<size_t>(i)];
@@ -165,6 +159,8 @@ int32_t lanes_height_left(const _VELMDRAW *d)
 int VELMDRAW_UpdateDrawAreas(VELMDRAW d, uint32_t)
 {
     if (!d || !d->state || !d->document->signal) return 0;
+    // Workers read the lanes being laid out.
+    join_workers(d);
     VELMSTATE *s = d->state;
     if (s->viewEnd == s->viewBegin) {
         s->viewEnd += 1;
@@ -205,7 +201,10 @@ int VELMDRAW_UpdateDrawAreas(VELMDRAW d, uint32_t)
                      : lane.kind == VELMDRAW_LANE_SPECTROGRAM ? on(f, 0x2)
                                                               : navigator;
     }
-    const int32_t gap = on(f, 0x80) ? 0 : 1;
+    // Each lane has a one-pixel border (unless 0x80); neighbours are one
+    // pixel apart besides, and that pixel is their separator.
+    const int32_t border = on(f, 0x80) ? 0 : 1;
+    const int32_t gap = border;
     const int32_t x = d->frame.left + inset;
     const int32_t width = d->frame.width - (on(f, 0x100) ? (on(f, 0x80) ? 0 : 2) : 4 + (on(f, 0x80) ? 0 : 2)) -
                           (on(f, 0x8) ? 0 : 55 + gap);
@@ -242,8 +241,9 @@ int VELMDRAW_UpdateDrawAreas(VELMDRAW d, uint32_t)
             if (placed) {
                 const bool divider = kind == 1 && c == 0;
                 const int32_t strip = divider ? gap + 2 : gap;
+                top += border;
                 if (strip > 0) (divider ? d->dividers : d->separators).add(make_rect(x, top, width, strip));
-                top += strip;
+                top += strip + border;
             }
             lane.area = make_rect(x, top, width, h);
             place_lane_extras(lane, f);
@@ -257,8 +257,9 @@ int VELMDRAW_UpdateDrawAreas(VELMDRAW d, uint32_t)
     // Custom tracks follow the lanes.
     for (int track = 0; track < VELM_MAX_CUSTOM_TRACKS; ++track) {
         if (!d->trackShown[static_cast<size_t>(track)]) continue;
+        top += border;
         d->trackSeparators.add(make_rect(x, top, width, 1));
-        top += 1;
+        top += 1 + border;
         _VELMRECT &area = d->trackAreas[static_cast<size_t>(track)];
         area = make_rect(x, top, width, area.height);
         d->trackScales[static_cast<size_t>(track)] = make_rect(area.right + 1 + gap, top, on(f, 0x8) ? 0 : 55, area.height);
@@ -276,7 +277,7 @@ int VELMDRAW_UpdateDrawAreas(VELMDRAW d, uint32_t)
         lane.area = make_rect(x, d->navigator.top + inset + c * h, width, h);
     }
 
-    d->horzScale = on(f, 0x4) ? _VELMRECT{} : make_rect(x, top + gap + 1, width, 20);
+    d->horzScale = on(f, 0x4) ? _VELMRECT{} : make_rect(x, top + 2 * border + gap, width, 20);
     d->zoomButton = _VELMRECT{};
     if ((f & 0x140008u) == 0x40000u && navigator) {
         d->zoomButton = make_rect(x + width + 17, d->navigator.top + (d->navigator.height - 20) / 2, 20, 20);

@@ -50,9 +50,10 @@ TEST_F(Layout, FramedWaveformsShareTheHeight)
     expect_rect(area(VELMDRAW_AREA_FRAME), 6, 6, 788, 388);
     // 1 + 2 pixels of border; 4 + 2 of width; 55 + 1 for the vertical scale.
     // Height: 388 - (2 * 2 + 4 + 1 + 1) - 20 for the horizontal scale = 358.
+    // Between lanes: a border, the separator and the next lane's border.
     expect_rect(area(0), 9, 9, 726, 179);
-    expect_rect(area(1), 9, 9 + 179 + 1, 726, 179);
-    expect_rect(area(VELMDRAW_AREA_HORZSCALE), 9, 9 + 359 + 2, 726, 20);
+    expect_rect(area(1), 9, 9 + 179 + 3, 726, 179);
+    expect_rect(area(VELMDRAW_AREA_HORZSCALE), 9, 9 + 2 * 179 + 3 + 3, 726, 20);
     EXPECT_EQ(area(2).height, 0); // spectrograms are not shown
 }
 
@@ -71,9 +72,9 @@ TEST_F(Layout, BothKindsSplitByTheWaveHeightFraction)
     const _VELMRECT w0 = area(0), w1 = area(1), s0 = area(2), s1 = area(3);
     EXPECT_EQ(w0.height + w1.height, 193);
     EXPECT_EQ(s0.height + s1.height, 194);
-    EXPECT_EQ(w1.top, w0.bottom + 2);  // channel separator
-    EXPECT_EQ(s0.top, w1.bottom + 4);  // the 3-pixel divider strip
-    EXPECT_EQ(s1.top, s0.bottom + 2);
+    EXPECT_EQ(w1.top, w0.bottom + 4);  // borders around the channel separator
+    EXPECT_EQ(s0.top, w1.bottom + 6);  // borders around the 3-pixel divider strip
+    EXPECT_EQ(s1.top, s0.bottom + 4);
     EXPECT_EQ(VELMAUDIO_GetDrawProperty(doc, 6), 193);
 
     // Property 6 sets the waveform share in pixels, kept within 20 % .. 80 %.
@@ -129,6 +130,21 @@ TEST_F(Layout, TinyViewsStillLayOut)
     const _VELMRECT r = area(0);
     EXPECT_GE(r.height, 0);
     EXPECT_GE(r.width, 0);
+}
+
+TEST(LayoutChannels, EightChannelsShowSix)
+{
+    velmtest::TempDir dir;
+    VELMAUDIO doc = viewtest::open_audio(dir.file("eight.wav"), viewtest::speech_like(8000, 8, 0.5), 8000, 8);
+    ASSERT_NE(doc, nullptr);
+    viewtest::Canvas canvas(600, 600);
+    VELMAUDIO_SetDrawProperty(doc, 2, 0x3 | 0x4000);
+    ASSERT_TRUE(canvas.draw(doc));
+    _VELMRECT r{};
+    EXPECT_TRUE(VELMAUDIO_GetDrawAreaRect(doc, 17, &r)); // the sixth navigator lane
+    EXPECT_GT(r.height, 0);
+    EXPECT_FALSE(VELMAUDIO_GetDrawAreaRect(doc, 18, &r));
+    VELMAUDIO_Close(doc);
 }
 
 TEST(LayoutGuards, NullArgumentsFail)
