@@ -90,7 +90,7 @@ void BM_SpectrogramColumnsOverAnHour(benchmark::State &state)
         }
     }
     state.counters["columns"] = double(kColumns) * lanes;
-    state.counters["per_column_us"] = benchmark::Counter(
+    state.counters["per_column"] = benchmark::Counter(
         double(kColumns) * lanes, benchmark::Counter::kIsIterationInvariantRate |
                                       benchmark::Counter::kInvert);
 }

@@ -30,9 +30,11 @@ std::string format_key(const char *format, va_list args)
     }
 }
 
-// The settings a read goes to: the document's when they hold the key, else the global ones.
-BLSETTINGS source_for(VELMAUDIO doc, const std::string &key)
+// The settings a read goes to: the document's when they hold the key (its
+// bracketed default aside), else the global ones.
+BLSETTINGS source_for(VELMAUDIO doc, const std::string &query)
 {
+    const std::string key = query.substr(0, query.find('='));
     if (doc->settings && BLSETTINGS_ExistsEx(doc->settings, "%s", key.c_str())) return doc->settings;
     return nullptr;
 }

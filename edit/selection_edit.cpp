@@ -131,7 +131,10 @@ int VELMAUDIO_AddSelection(VELMAUDIO doc, int64_t a, int64_t b)
 {
     if (!loaded(doc)) return 0;
     const int64_t left = VELMAUDIO_ViewBeginLimit(doc), right = VELMAUDIO_ViewEndLimit(doc);
-    const int64_t lo = std::max(left, std::min(a, b)), hi = std::min(right, std::max(a, b));
+    // Both ends are clamped into the limits, so a range wholly outside them
+    // collapses instead of turning inside out.
+    const int64_t lo = std::clamp(std::min(a, b), left, std::max(left, right));
+    const int64_t hi = std::clamp(std::max(a, b), left, std::max(left, right));
     double tb = VELMAUDIO_SampleToTime(doc, lo), te = VELMAUDIO_SampleToTime(doc, hi);
     const int64_t cursor = std::min(std::max(left, b), right);
     if (tb == te) {
@@ -153,7 +156,9 @@ int VELMAUDIO_AddSelection(VELMAUDIO doc, int64_t a, int64_t b)
 int VELMAUDIO_DelSelection(VELMAUDIO doc, int64_t a, int64_t b)
 {
     if (!loaded(doc)) return 0;
-    const int64_t lo = std::max<int64_t>(0, std::min(a, b)), hi = std::min(sample_count(doc), std::max(a, b));
+    const int64_t count = sample_count(doc);
+    const int64_t lo = std::clamp<int64_t>(std::min(a, b), 0, count);
+    const int64_t hi = std::clamp<int64_t>(std::max(a, b), 0, count);
     double tb = VELMAUDIO_SampleToTime(doc, lo), te = VELMAUDIO_SampleToTime(doc, hi);
     if (tb == te) return 0;
     if (!send(doc, 0x2000D, &tb, &te)) {

@@ -39,7 +39,8 @@ BL_API int  BLCORE_Initialize(void);
 BL_API void BLCORE_Finalize(void);
 BL_API int  BLCORE_IsInitialized(void);
 
-/* Records a component's version; BLVERSION_String answers "name a.b.c.d". */
+/* Records a component's version (again: replaces it); BLVERSION_String
+ * writes "name a.b.c.d" cut to the buffer, and answers 0 for an unknown name. */
 BL_API int  BLVERSION_Register(const char *name, int major, int minor, int release, int build);
 BL_API int  BLVERSION_String(const char *name, char *buffer, int size);
 
@@ -56,7 +57,8 @@ typedef struct BLMemPool *BLMEM;
 /* A pool owns every block taken from it and frees them all when disposed.
  * Blocks are zero-filled, each is its own heap allocation.  Only the pool a
  * block came from can delete it (Delete answers 0 for any other pointer).
- * A pool is used by one thread at a time unless made with the thread-safe flag. */
+ * A pool is used by one thread at a time unless made with the thread-safe
+ * flag.  initial_size is only a hint: blocks are allocated one by one. */
 BL_API BLMEM   BLMEM_CreateMemDescrEx(const char *name, size_t initial_size, int flags);
 BL_API int     BLMEM_DisposeMemDescr(BLMEM pool);
 BL_API void   *BLMEM_New(BLMEM pool, size_t size);
@@ -121,8 +123,9 @@ BL_API int BLSETTINGS_ExistsEx(BLSETTINGS settings, const char *format, ...) BL_
 /* Removes a key's value (its default stays); 0 when it had none. */
 BL_API int BLSETTINGS_DeleteEx(BLSETTINGS settings, const char *format, ...) BL_PRINTF(2, 3);
 
-/* Reads "key" or "key=[default]": the value, else the default given in
- * brackets, else the registered default, else 0 / false / "".  Through the
+/* Reads "key" or "key=[default]": the value, else the registered default,
+ * else the default given in brackets (a key is missing only when it has
+ * neither value nor registered default), else 0 / false / "".  Through the
  * null handle the inserted objects are asked before the process-wide
  * registry, for values and then for defaults.  A text that does not read as
  * the wanted type gives way to the next one.  Numbers are read without
@@ -163,8 +166,13 @@ BL_API int      BLNOTIFY_DelHandler(BLNOTIFY dispatcher, BLNOTIFY_Handler handle
 BL_API int      BLNOTIFY_AddDefaultHandler(BLNOTIFY_Handler handler, void *user);
 BL_API int      BLNOTIFY_DelDefaultHandler(BLNOTIFY_Handler handler, void *user);
 /* Calls the dispatcher's handlers, then the default handlers, synchronously
- * in the calling thread.  Returns 1 when no handler answered otherwise, else
- * the first answer that was not 1.  sender and flags are reserved (pass 0). */
+ * in the calling thread, each in the order added.  Every handler sees the
+ * event; returns 1 when no handler answered otherwise, else the first answer
+ * that was not 1 (0 for a destroyed dispatcher).  Handlers may add and remove
+ * handlers or destroy the dispatcher meanwhile: a handler removed before its
+ * turn is skipped, one added is called from the next event on.  A pair of
+ * handler and user value is registered once.  sender and flags are reserved
+ * (pass 0). */
 BL_API int      BLNOTIFY_SendEvent(BLNOTIFY dispatcher, void *sender, int flags,
                                    uint32_t event, void *data1, void *data2);
 
@@ -172,6 +180,8 @@ BL_API int      BLNOTIFY_SendEvent(BLNOTIFY dispatcher, void *sender, int flags,
 
 typedef int (*BLOBJECT_Disposer)(void *object);
 
+/* An object is registered once (0 the second time); kind is informative.
+ * The disposer (may be null) is called without any lock held. */
 BL_API int RegisterObject(void *object, int kind, BLOBJECT_Disposer disposer);
 BL_API int UnRegisterObject(void *object);
 BL_API int IsRegisteredObject(void *object);
@@ -197,8 +207,11 @@ BL_API void BLDEBUG_Log(int level, const char *format, ...) BL_PRINTF(2, 3);
 BL_API void BLDEBUG_Warning(int code, const char *format, ...) BL_PRINTF(2, 3);
 BL_API void BLDEBUG_Error(int code, const char *format, ...) BL_PRINTF(2, 3);
 BL_API void BLDEBUG_TerminalError(int code, const char *format, ...) BL_PRINTF(2, 3);
-/* Nothing is printed until a destination is chosen.  Level threshold,
- * a file ("-" for standard error, null to stop), and a callback sink. */
+/* Nothing is printed until a destination is chosen.  Level threshold
+ * (default BLDEBUG_LEVEL_INFO; warnings and errors have level -1), a file
+ * opened for appending ("-" for standard error, null to stop), and a
+ * callback sink (null to stop) called in the logging thread.  One line per
+ * message; a trailing line break of the message is dropped. */
 BL_API void BLDEBUG_SetLevel(int level);
 BL_API int  BLDEBUG_GetLevel(void);
 BL_API int  BLDEBUG_SetLogFile(const char *path);
@@ -211,11 +224,15 @@ typedef void *(*BLTHREAD_Body)(void *arguments);
 
 /* Starts body(arguments) on a new thread; flags are reserved (pass 0). */
 BL_API BLTHREAD BLTHREAD_AddThread(BLTHREAD_Body body, void *arguments, int flags);
-/* wait = 1 joins the thread; 0 lets it finish alone.  Frees the handle. */
+/* wait = 1 joins the thread; 0 lets it finish alone (nothing waits for it,
+ * so it must not touch anything its caller frees next).  A worker ending its
+ * own handle is never joined.  Frees the handle. */
 BL_API int      BLTHREAD_EndThread(BLTHREAD thread, int wait);
-/* Called by a worker just before it returns. */
+/* Called by a worker just before it returns; marks the end in the log. */
 BL_API void     ThreadChildNotifyExit(int code);
 
+/* Locks are recursive: the owner may lock again and unlocks as often.  Only
+ * the owner can unlock (others get 0); a held lock is not destroyed (0). */
 typedef struct BLMutex *BLMUTEX;
 BL_API BLMUTEX MutexInit(void);
 BL_API int     MutexLock(BLMUTEX mutex);

@@ -121,7 +121,7 @@ int BLDEBUG_SetLogFile(const char *path)
         log.file_is_stderr = true;
         return 1;
     }
-    FILE *file = std::fopen(path, "a");
+    FILE *file = std::fopen(path, "ae");
     if (!file) return 0;
     CloseFile(log);
     log.file = file;

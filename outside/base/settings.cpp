@@ -136,7 +136,8 @@ int Change(BLSETTINGS handle, const std::string &text, bool secret)
 }
 
 // The texts a read may answer with, best first: the value (with its secret
-// mark), the default given with the key, the registered default.
+// mark), the registered default, the default given with the key.  A key the
+// program registered is not missing, so its default wins over the reader's.
 struct Candidates {
     std::vector<std::string> texts;
     std::string key;
@@ -161,7 +162,6 @@ bool Gather(BLSETTINGS handle, const std::string &query, Candidates &out)
             break;
         }
     }
-    if (fallback) out.texts.push_back(*fallback);
     for (const BLSettings *settings : chain) {
         const auto found = settings->entries.find(lower);
         if (found != settings->entries.end() && found->second.default_value) {
@@ -169,6 +169,7 @@ bool Gather(BLSETTINGS handle, const std::string &query, Candidates &out)
             break;
         }
     }
+    if (fallback) out.texts.push_back(*fallback);
     return true;
 }
 

@@ -4,8 +4,8 @@
  * Layout: a key's first dotted part is its section and the rest its name, so
  * "libvelm.draw.hovertime=500" is written as "draw.hovertime=500" under
  * "[libvelm]".  Keys without a dot come first, before any section.
- * Values are written with backslash escapes for '\\', line breaks and a
- * leading '{'; secret values are written as "{obscured}" and hex digits.
+ * In values a backslash, the line breaks and a leading '{' are escaped with
+ * a backslash; secret values are written as "{obscured}" and hex digits.
  */
 #include "outside/base/blbase.h"
 #include "outside/base/base_internal.h"
@@ -224,7 +224,7 @@ bool ValidKey(std::string_view key)
 
 bool LoadIniFile(const std::string &path, SettingEntries &entries, bool *damaged)
 {
-    FILE *file = std::fopen(path.c_str(), "rb");
+    FILE *file = std::fopen(path.c_str(), "rbe");
     if (!file) return false;
     std::string line, section;
     bool section_ok = true, too_long = false;
@@ -247,7 +247,7 @@ bool LoadIniFile(const std::string &path, SettingEntries &entries, bool *damaged
 bool SaveIniFile(const std::string &path, const SettingEntries &entries, bool keep_copy)
 {
     std::string temporary = path + ".XXXXXX";
-    const int fd = ::mkstemp(temporary.data());
+    const int fd = ::mkostemp(temporary.data(), O_CLOEXEC);
     if (fd < 0) {
         BLDEBUG_Error(-1, "BLSETTINGS: cannot write %s: %s", path.c_str(), std::strerror(errno));
         return false;

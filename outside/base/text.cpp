@@ -1,11 +1,10 @@
+/* Text helpers shared inside the library: formatting, interning, case and trimming. */
 #include "outside/base/base_internal.h"
 
-#include <algorithm>
-#include <cctype>
 #include <cstdio>
 #include <cstring>
-#include <optional>
 #include <mutex>
+#include <optional>
 #include <unordered_set>
 
 namespace blbase {
@@ -91,9 +90,10 @@ void ClearInternedTexts()
 
 std::string ToLower(std::string_view text)
 {
+    // ASCII only: the locale must not touch the bytes of UTF-8 keys.
     std::string lower(text);
-    std::transform(lower.begin(), lower.end(), lower.begin(),
-                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+    for (char &c : lower)
+        if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
     return lower;
 }
 

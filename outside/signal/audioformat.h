@@ -128,17 +128,37 @@ typedef struct _audio_format_descr {
     const AUDIO_FORMAT_ENTRY *entries;
 } AUDIO_FORMAT_DESCR;
 
+/* Format strings name a file type and its options: NAME or NAME[key=value,...],
+ * names and keys without regard to case, no spaces.  Names: AUTO (detect on
+ * open; on save, by the file name's extension, else WAVE), WAVE (WAV, WAVPCM),
+ * WAVFLOAT, RF64, W64, AIFF (AIF), AIFFFLOAT, CAF, CAFFLOAT, RAW, RAWFLOAT,
+ * FLAC, OGG (VORBIS), OPUS, MP3, LINK.  Keys:
+ *   sr=rate, nc=channels   headerless files (RAW; AUTO reads a file it does
+ *                          not recognise as headerless when both are given);
+ *                          saves always write the signal's own
+ *   nbits=8|16|24|32|64    stored depth (bps is the same key); 64 with floats
+ *   endian=little|big      headerless files (little unless told)
+ *   offset=bytes           header bytes to skip in a headerless file
+ *   quality=0..1           lossy encoders
+ * A reading conversion may follow: "AUTO:FMTCONV[sr=8000,nc=1,nbits=16]".
+ * Anything else, or a value out of range, is AUDIO_ERROR_BAD_FORMAT_STRING.
+ * Saving WAVE writes RF64 once a file passes 4 GB. */
+
 /* Opaque audio file opened by AUDIO_LoadFile or AUDIO_CreateFileEx. */
 typedef struct _audio_file AUDIO_FILE;
 
-/* Start and stop the library: counted, the last Finalize releases its state. */
+/* Start and stop the library: counted; Finalize answers 0 when nothing was
+ * started.  The calls of this header work without them. */
 AUDIO_API int  AUDIO_Initialize(void);
 AUDIO_API int  AUDIO_Finalize(void);
 
-/* Format records. */
+/* Format records.  InitFormat leaves the container at AUDIO_CONTAINER_NONE
+ * and picks the coding from the depth: 32 bits are floats, 8 to 24 bits
+ * integers.  NullFormat is all zeros. */
 AUDIO_API _audio_format AUDIO_InitFormat(int sampleRate, int numChannels, int bitsPerSample);
 AUDIO_API _audio_format AUDIO_NullFormat(void);
-/* 1 when the record describes samples that can exist (rate, channels, bits in range). */
+/* 1 when the record describes samples that can exist: rate and channels in
+ * range, bits 0 (unspecified: saved as 16) to 64. */
 AUDIO_API int AUDIO_IsValidFormat(const _audio_format *format);
 /* "sr=44100,nc=2,nbits=16" in a per-thread buffer of 64 bytes valid until the
  * thread's next call; "invalid" for a null or unusable format. */

@@ -67,7 +67,7 @@ typedef struct _DSPB_FFTPROC DSPB_FFTPROC;
 /* A processor for one FFT length; null for a refused length.  One processor
  * may be used from several threads at once (a call that finds the
  * processor's buffers busy works in buffers of its own); one processor per
- * thread avoids that cost. */
+ * thread avoids that cost.  Destroy it once no thread uses it any more. */
 DSPB_API DSPB_FFTPROC *DSPB_FFTProcCreate(int fftLength);
 DSPB_API void          DSPB_FFTProcDestroy(DSPB_FFTPROC *proc);
 /* Power spectrum of in[0 .. N-1] (left untouched): out[k] = |X[k]|^2 for

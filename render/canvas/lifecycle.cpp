@@ -68,3 +68,13 @@ int VELMCANVAS_ResizeCanvas(VELMCANVAS canvas, int width, int height)
     }
     return Call<&Ops::ResizeCanvas>(canvas, 0, width, height);
 }
+
+int VELMCANVAS_GetDisplayWidth(void)
+{
+    return BLUTILS_GetDisplayWidth();
+}
+
+int VELMCANVAS_GetDisplayHeight(void)
+{
+    return BLUTILS_GetDisplayHeight();
+}

@@ -305,16 +305,19 @@ VELM_API int VELMCANVAS_DrawImage(VELMCANVAS canvas, int x, int y, int width, in
 
 /* ---- Composite operations --------------------------------------------- */
 
-/* Pastes the image over the rectangle, clipped to it. */
+/* Pastes the image over the rectangle, clipped to it; 0 when a paste
+ * failed (the clip is lifted all the same). */
 VELM_API int VELMCANVAS_TileImage(VELMCANVAS canvas, VELMCANVASIMAGE image, const _VELMRECT *rect);
 /* Word-wrapped text centred vertically in the rectangle (it fills nothing);
- * flags: VELMCANVASTEXT_ alignment and ellipsis.  Always 1. */
+ * flags: VELMCANVASTEXT_ alignment and ellipsis.  1 whatever fits; 0 only
+ * for a null canvas, rectangle or text. */
 VELM_API int VELMCANVAS_FillRectangleText(VELMCANVAS canvas, const _VELMRECT *rect,
                                           const char *text, int flags);
 /* Draws the character centred in a cell of max(its width, min_width);
- * returns the next pen position x + cell (x itself on failure). */
+ * returns the next pen position x + cell (0 for an unusable canvas). */
 VELM_API int VELMCANVAS_DrawChar(VELMCANVAS canvas, int x, int y, char character, int min_width);
-/* A frame of the library's region pictures around the rectangle. */
+/* A frame of the library's region pictures around the rectangle, fitted to
+ * the canvas like a shape with corner size 32. */
 VELM_API int VELMCANVAS_BevelRect(VELMCANVAS canvas, int x, int y, int width, int height);
 
 /* The screen size, as the base services know it. */

@@ -83,6 +83,7 @@ TEST_F(Doc, HandlersMayRewriteOrRefuseTheWindow)
     VELMAUDIO_AddEventHandler(doc, refuse, &code);
     EXPECT_FALSE(VELMAUDIO_Zoom(doc, 200, 400));
     EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 10);
+    VELMAUDIO_DelEventHandler(doc, refuse, &code);
 }
 
 TEST_F(Doc, ScrollingStopsAtTheLimits)
@@ -166,6 +167,7 @@ TEST_F(Doc, VerticalRange)
     VELMAUDIO_AddEventHandler(doc, refuse, &code);
     EXPECT_FALSE(VELMAUDIO_ZoomVerticalReset(doc));
     EXPECT_NEAR(VELMAUDIO_GetState(doc)->vertMax, 0.9, 1e-6);
+    VELMAUDIO_DelEventHandler(doc, refuse, &code);
 }
 
 TEST_F(Doc, SpectralRange)
@@ -206,6 +208,7 @@ TEST_F(Doc, CursorClampsAndMarksItsChange)
     ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, 500));
     EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.begin, 0.0625);
     EXPECT_DOUBLE_EQ(VELMAUDIO_GetDisplayTime(doc), 0.0625);
+    VELMAUDIO_DelEventHandler(doc, record, &moves);
 }
 
 TEST_F(Doc, KeepTheCursorVisible)

@@ -10,8 +10,26 @@
 
 namespace {
 
+struct Counter {
+    std::vector<uint32_t> codes;
+    uint32_t veto = 0;
+    static int handler(const BLNotifyEvent *e, void *user)
+    {
+        auto *c = static_cast<Counter *>(user);
+        c->codes.push_back(e->event);
+        return e->event == c->veto ? 0 : 1;
+    }
+    int count(uint32_t code) const
+    {
+        int n = 0;
+        for (uint32_t c : codes) n += c == code;
+        return n;
+    }
+};
+
 // A 10 s document at 1 kHz: samples and milliseconds coincide.
 struct Sel : ::testing::Test {
+    Counter events; // outlives the document, which sends events while it closes
     VELMAUDIO doc = nullptr;
     void SetUp() override
     {
@@ -30,28 +48,10 @@ struct Sel : ::testing::Test {
     using List = std::vector<std::pair<int64_t, int64_t>>;
 };
 
-struct Counter {
-    std::vector<uint32_t> codes;
-    uint32_t veto = 0;
-    static int handler(const BLNotifyEvent *e, void *user)
-    {
-        auto *c = static_cast<Counter *>(user);
-        c->codes.push_back(e->event);
-        return e->event == c->veto ? 0 : 1;
-    }
-    int count(uint32_t code) const
-    {
-        int n = 0;
-        for (uint32_t c : codes) n += c == code;
-        return n;
-    }
-};
-
 } // namespace
 
 TEST_F(Sel, EmptyRangesOnlyMoveTheCursor)
 {
-    Counter events;
     VELMAUDIO_AddEventHandler(doc, Counter::handler, &events);
     EXPECT_TRUE(VELMAUDIO_AddSelection(doc, 20000, 12000));
     EXPECT_EQ(VELMAUDIO_GetCursorPosition(doc), 10000);
@@ -116,7 +116,6 @@ TEST_F(Sel, InvertAndSelectToStart)
 
 TEST_F(Sel, VetoesStopTheCommand)
 {
-    Counter events;
     VELMAUDIO_AddEventHandler(doc, Counter::handler, &events);
     events.veto = 0x2000B;
     EXPECT_FALSE(VELMAUDIO_AddSelection(doc, 100, 200));

@@ -25,8 +25,8 @@ std::shared_ptr<const FFTPlan> make_plan_locked(int length)
     FFTBuffers scratch(length);
     if (!scratch)
         return nullptr;
-    // Estimated plans are made in microseconds and give the same plan on every
-    // run, so spectra are reproducible.
+    // Estimated plans take a millisecond or two to make (measured ones take
+    // hundreds) and are the same on every run, so spectra are reproducible.
     fftwf_plan plan = fftwf_plan_dft_r2c_1d(length, scratch.real.get(), scratch.spectrum.get(),
                                             FFTW_ESTIMATE);
     if (!plan)

@@ -15,12 +15,14 @@ class FileReader {  // one open audio file, frames as interleaved float32
 public:
     virtual ~FileReader();
     virtual const _audio_format &format() const = 0;  // rate, channels, bits, container, coding
-    // Random-access readers: the exact frame count.  Others: the header's
+    // Random-access readers: the exact frame count (a read inside it is short
+    // only when the file shrank since it was opened).  Others: the header's
     // claim (bounded by the file size); reading until a short read is exact.
     virtual int64_t frames() const = 0;
     virtual bool random_access() const = 0;  // true: PCM read in place, seekable at any frame
-    // Reads count frames from first into out (interleaved); thread-safe (own
-    // lock); returns frames read (short at the end) or -1 with the last error set.
+    // Reads count frames from first into out (interleaved); thread-safe
+    // (little-endian PCM reads run in parallel, other readers take a lock);
+    // returns frames read (short at the end) or -1 with the last error set.
     virtual int64_t read(int64_t first, float *out, int64_t count) = 0;
     virtual AUDIOMETADATA *metadata();        // read from the file; owned by the reader, may be null
     virtual const char *format_name() const;  // e.g. "WAVE" for the "AUTO" replacement

@@ -60,7 +60,8 @@ public:
     const _audio_format &format() const override { return format_; }
     int64_t frames() const override {
         double ratio = static_cast<double>(format_.sampleRate) / source_->format().sampleRate;
-        return static_cast<int64_t>(std::llround(static_cast<double>(source_->frames()) * ratio));
+        double frames = static_cast<double>(source_->frames()) * ratio;
+        return frames >= 9.2e18 ? INT64_MAX : std::llround(frames);
     }
     // Channel mixing alone keeps every frame where it was.
     bool random_access() const override { return !resampler_ && source_->random_access(); }

@@ -2,6 +2,7 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <bit>
 #include <cerrno>
 #include <cstring>
@@ -14,7 +15,7 @@ namespace {
 
 int bytes_of(int coding) {
     switch (coding) {
-        case AUDIO_FORMAT_PCM_U8: return 1;
+        case AUDIO_FORMAT_PCM_U8: case AUDIO_FORMAT_PCM_S8: return 1;
         case AUDIO_FORMAT_PCM_16: return 2;
         case AUDIO_FORMAT_PCM_24: return 3;
         case AUDIO_FORMAT_PCM_32: case AUDIO_FORMAT_FLOAT: return 4;
@@ -22,67 +23,111 @@ int bytes_of(int coding) {
     }
 }
 
-// Widens n samples stored at the start of `out` as raw bytes into floats
-// (the scale libsndfile uses: full scale is 1.0).  Samples grow, so the
-// last is converted first and nothing is overwritten before it is read.
-void widen_in_place(float *out, int64_t n, int coding) {
-    auto *raw = reinterpret_cast<const unsigned char *>(out);
-    switch (coding) {
-        case AUDIO_FORMAT_PCM_U8:
-            for (int64_t i = n - 1; i >= 0; --i) out[i] = static_cast<float>(raw[i] - 128) * (1.0f / 128);
-            break;
-        case AUDIO_FORMAT_PCM_16:
-            for (int64_t i = n - 1; i >= 0; --i) {
-                int16_t v;
-                std::memcpy(&v, raw + 2 * i, 2);
-                out[i] = static_cast<float>(v) * (1.0f / 32768);
-            }
-            break;
-        case AUDIO_FORMAT_PCM_24:
-            for (int64_t i = n - 1; i >= 0; --i) {
-                const unsigned char *b = raw + 3 * i;
-                auto v = static_cast<int32_t>(uint32_t{b[0]} << 8 | uint32_t{b[1]} << 16 | uint32_t{b[2]} << 24);
-                out[i] = static_cast<float>(v >> 8) * (1.0f / 8388608);
-            }
-            break;
-        case AUDIO_FORMAT_PCM_32:
-            for (int64_t i = 0; i < n; ++i) {
-                int32_t v;
-                std::memcpy(&v, raw + 4 * i, 4);
-                out[i] = static_cast<float>(v) * (1.0f / 2147483648.0f);
-            }
-            break;
-        default:  // floats are stored as they are
-            break;
+// Bytes read per positioned read: small enough to stay in the cache
+// between the read and the conversion.
+constexpr int64_t kChunkBytes = 32768;
+
+// Reads up to size bytes at offset; the bytes read, or -1.
+int64_t pread_fully(int fd, void *buffer, int64_t size, int64_t offset) {
+    auto *p = static_cast<char *>(buffer);
+    int64_t done = 0;
+    while (done < size) {
+        ssize_t n = pread(fd, p + done, static_cast<size_t>(size - done), offset + done);
+        if (n < 0 && errno == EINTR) continue;
+        if (n < 0) return -1;
+        if (n == 0) break;  // the file got shorter since it was opened
+        done += n;
     }
+    return done;
+}
+
+// Reads `count` frames in cache-sized chunks of Sample words and widens each
+// chunk with widen(words, out, samples).
+template <typename Sample, typename Widen>
+int64_t read_chunked(int fd, int64_t offset, int64_t bytes_per_frame, int channels, float *out, int64_t count,
+                     Widen widen) {
+    Sample raw[kChunkBytes / sizeof(Sample)];
+    const int64_t chunk_frames = kChunkBytes / bytes_per_frame;
+    int64_t done = 0;
+    while (done < count) {
+        int64_t frames = std::min(chunk_frames, count - done);
+        int64_t got = pread_fully(fd, raw, frames * bytes_per_frame, offset + done * bytes_per_frame);
+        if (got < 0) return -1;
+        int64_t whole = got / bytes_per_frame;
+        widen(raw, out + done * channels, whole * channels);
+        done += whole;
+        if (whole < frames) break;
+    }
+    return done;
+}
+
+// The scales libsndfile uses: full scale reads as 1.0.
+template <typename Sample>
+void scale(const Sample *raw, float *out, int64_t n, float factor) {
+    for (int64_t i = 0; i < n; ++i) out[i] = static_cast<float>(raw[i]) * factor;
 }
 
 }  // namespace
 
 bool DirectPcm::handles(int coding) { return std::endian::native == std::endian::little && bytes_of(coding) > 0; }
 
-DirectPcm::DirectPcm(int fd, int64_t data_offset, int coding, int channels)
+DirectPcm::DirectPcm(int fd, int64_t data_offset, int coding, int channels, bool big_endian)
     : fd_(fd),
       data_offset_(data_offset),
       coding_(coding),
       channels_(channels),
-      bytes_per_sample_(bytes_of(coding)),
+      big_endian_(big_endian),
       bytes_per_frame_(int64_t{bytes_of(coding)} * channels) {}
 
 int64_t DirectPcm::read(int64_t first, float *out, int64_t count) const {
-    auto *p = reinterpret_cast<char *>(out);
-    int64_t want = count * bytes_per_frame_, done = 0;
     int64_t at = data_offset_ + first * bytes_per_frame_;
-    while (done < want) {
-        ssize_t n = pread(fd_, p + done, static_cast<size_t>(want - done), at + done);
-        if (n < 0 && errno == EINTR) continue;
-        if (n < 0) return -1;
-        if (n == 0) break;  // the file got shorter since it was opened
-        done += n;
+    auto read = [&](auto sample, auto widen) {
+        return read_chunked<decltype(sample)>(fd_, at, bytes_per_frame_, channels_, out, count, widen);
+    };
+    switch (coding_) {
+        case AUDIO_FORMAT_PCM_U8:
+            return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
+                for (int64_t i = 0; i < n; ++i) o[i] = static_cast<float>(raw[i] - 128) * (1.0f / 128);
+            });
+        case AUDIO_FORMAT_PCM_S8:
+            return read(int8_t{}, [](const int8_t *raw, float *o, int64_t n) { scale(raw, o, n, 1.0f / 128); });
+        case AUDIO_FORMAT_PCM_16:
+            if (big_endian_)
+                return read(uint16_t{}, [](const uint16_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i)
+                        o[i] = static_cast<float>(static_cast<int16_t>(__builtin_bswap16(raw[i]))) * (1.0f / 32768);
+                });
+            return read(int16_t{}, [](const int16_t *raw, float *o, int64_t n) { scale(raw, o, n, 1.0f / 32768); });
+        case AUDIO_FORMAT_PCM_24:
+            // The three bytes go to the top of a 32-bit word, then shift down
+            // keeping the sign.
+            if (big_endian_)
+                return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i, raw += 3) {
+                        auto v = static_cast<int32_t>(uint32_t{raw[0]} << 24 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 8);
+                        o[i] = static_cast<float>(v >> 8) * (1.0f / 8388608);
+                    }
+                });
+            return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
+                for (int64_t i = 0; i < n; ++i, raw += 3) {
+                    auto v = static_cast<int32_t>(uint32_t{raw[0]} << 8 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 24);
+                    o[i] = static_cast<float>(v >> 8) * (1.0f / 8388608);
+                }
+            });
+        case AUDIO_FORMAT_PCM_32:
+            if (big_endian_)
+                return read(uint32_t{}, [](const uint32_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i)
+                        o[i] = static_cast<float>(static_cast<int32_t>(__builtin_bswap32(raw[i]))) * (1.0f / 2147483648.0f);
+                });
+            return read(int32_t{}, [](const int32_t *raw, float *o, int64_t n) { scale(raw, o, n, 1.0f / 2147483648.0f); });
+        default:  // floats are stored as they are
+            if (big_endian_)
+                return read(uint32_t{}, [](const uint32_t *raw, float *o, int64_t n) {
+                    for (int64_t i = 0; i < n; ++i) o[i] = std::bit_cast<float>(__builtin_bswap32(raw[i]));
+                });
+            return read(float{}, [](const float *raw, float *o, int64_t n) { std::copy(raw, raw + n, o); });
     }
-    int64_t frames = done / bytes_per_frame_;
-    widen_in_place(out, frames * channels_, coding_);
-    return frames;
 }
 
 }  // namespace velmsig

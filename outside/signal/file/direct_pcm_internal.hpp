@@ -1,6 +1,5 @@
-// Little-endian PCM samples read straight from the file: one positioned read
-// into the caller's buffer, widened to floats in place.  Needs no lock, so
-// any number of threads read at once.
+// PCM samples read straight from the file with positioned reads and widened
+// to floats.  Needs no lock, so any number of threads read at once.
 #pragma once
 
 #include <cstdint>
@@ -9,12 +8,12 @@ namespace velmsig {
 
 class DirectPcm {
 public:
-    // Codings this path handles (AUDIO_FORMAT_*): 8-bit unsigned, 16, 24 and
-    // 32-bit integers and 32-bit floats, little-endian, on a little-endian host.
+    // Codings this path handles (AUDIO_FORMAT_*): 8-bit, 16, 24 and 32-bit
+    // integers and 32-bit floats, on a little-endian host.
     static bool handles(int coding);
 
     // fd stays owned by the caller; data_offset is the first frame's byte.
-    DirectPcm(int fd, int64_t data_offset, int coding, int channels);
+    DirectPcm(int fd, int64_t data_offset, int coding, int channels, bool big_endian);
 
     // Frames read into out (short at the end of the file), or -1 when the
     // read fails.
@@ -27,7 +26,7 @@ private:
     int64_t data_offset_;
     int coding_;
     int channels_;
-    int bytes_per_sample_;
+    bool big_endian_;
     int64_t bytes_per_frame_;
 };
 

@@ -2,13 +2,13 @@
 #include "outside/signal/file/formats_internal.hpp"
 
 #include <sndfile.h>
-#include <strings.h>
 
 #include <cmath>
 #include <cstdio>
 #include <vector>
 
 #include "outside/signal/audioformat.h"
+#include "outside/signal/file/text_internal.hpp"
 
 namespace velmsig {
 
@@ -188,9 +188,7 @@ bool is_float_coding(int coding) { return coding == AUDIO_FORMAT_FLOAT || coding
 
 const FormatName *find_format_name(std::string_view name) {
     for (const auto &n : kNames)
-        if (name.size() == std::char_traits<char>::length(n.name) &&
-            strncasecmp(name.data(), n.name, name.size()) == 0)
-            return &n;
+        if (equals_nocase(name, n.name)) return &n;
     return nullptr;
 }
 
@@ -267,7 +265,7 @@ AUDIO_API _audio_format AUDIO_NullFormat(void) { return _audio_format{}; }
 
 AUDIO_API int AUDIO_IsValidFormat(const _audio_format *f) {
     return f && f->sampleRate > 0 && f->sampleRate <= AUDIO_MAX_SAMPLE_RATE && f->numChannels > 0 &&
-           f->numChannels <= AUDIO_MAX_CHANNELS && f->bitsPerSample > 0 && f->bitsPerSample <= 64;
+           f->numChannels <= AUDIO_MAX_CHANNELS && f->bitsPerSample >= 0 && f->bitsPerSample <= 64;
 }
 
 AUDIO_API const char *AUDIO_ComposeFormatString(const _audio_format *f) {

@@ -1,14 +1,13 @@
 // Strict parser and composer of format strings.
 #include "outside/signal/file/formatstring_internal.hpp"
 
-#include <strings.h>
-
 #include <cctype>
 #include <charconv>
 #include <string_view>
 
 #include "outside/signal/audioformat.h"
 #include "outside/signal/file/formats_internal.hpp"
+#include "outside/signal/file/text_internal.hpp"
 
 namespace velmsig {
 
@@ -16,10 +15,6 @@ namespace {
 
 // Longer texts are not format strings; refusing them bounds the work.
 constexpr size_t kMaxFormatText = 4096;
-
-bool equals_nocase(std::string_view a, const char *b) {
-    return a.size() == std::char_traits<char>::length(b) && strncasecmp(a.data(), b, a.size()) == 0;
-}
 
 bool parse_int(std::string_view v, long long lo, long long hi, long long *out) {
     long long x = 0;

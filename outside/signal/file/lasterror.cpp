@@ -1,5 +1,7 @@
 #include "outside/signal/file/lasterror_internal.hpp"
 
+#include <cerrno>
+
 #include "outside/signal/audioformat.h"
 
 namespace velmsig {
@@ -9,6 +11,15 @@ thread_local int last_error = AUDIO_ERROR_NONE;
 }
 
 void set_last_error(int code) { last_error = code; }
+
+int error_of_errno(int e, int fallback) {
+    switch (e) {
+        case ENOENT: case ENOTDIR: return AUDIO_ERROR_FILE_NOT_FOUND;
+        case EACCES: case EPERM: case EROFS: return AUDIO_ERROR_ACCESS_DENIED;
+        case ENOMEM: return AUDIO_ERROR_OUT_OF_MEMORY;
+        default: return fallback;
+    }
+}
 
 }  // namespace velmsig
 

@@ -1,20 +1,20 @@
 #include "outside/signal/file/link_internal.hpp"
 
 #include <fcntl.h>
-#include <strings.h>
 #include <sys/stat.h>
 
 #include <string_view>
 
 #include "outside/signal/audioformat.h"
 #include "outside/signal/file/lasterror_internal.hpp"
+#include "outside/signal/file/text_internal.hpp"
 #include "outside/signal/file/unique_fd_internal.hpp"
 
 namespace velmsig {
 
 namespace {
 
-constexpr std::string_view kSection = "velm.link";
+constexpr std::string_view kPrefix = "velm.link.";
 
 std::string_view trim(std::string_view s) {
     while (!s.empty() && (s.front() == ' ' || s.front() == '\t' || s.front() == '\r')) s.remove_prefix(1);
@@ -22,14 +22,11 @@ std::string_view trim(std::string_view s) {
     return s;
 }
 
-bool equals_nocase(std::string_view a, std::string_view b) {
-    return a.size() == b.size() && strncasecmp(a.data(), b.data(), a.size()) == 0;
-}
-
 // Calls f(full key, value) for each "key=value" line; sections prefix keys.
 template <typename F>
 void for_each_entry(std::string_view text, F f) {
     std::string section;
+    bool readable = true;  // false under a section header settings files refuse
     while (!text.empty()) {
         size_t nl = text.find('\n');
         std::string_view line = trim(text.substr(0, nl));
@@ -37,10 +34,11 @@ void for_each_entry(std::string_view text, F f) {
         if (line.empty() || line.front() == ';' || line.front() == '#') continue;
         if (line.front() == '[' && line.back() == ']') {
             section = std::string(trim(line.substr(1, line.size() - 2)));
+            readable = !section.empty() && section.find('.') == std::string::npos;
             continue;
         }
         size_t eq = line.find('=');
-        if (eq == std::string_view::npos) continue;
+        if (eq == std::string_view::npos || !readable) continue;
         std::string key = section.empty() ? "" : section + ".";
         key += trim(line.substr(0, eq));
         f(std::string_view(key), trim(line.substr(eq + 1)));
@@ -53,7 +51,7 @@ bool looks_like_link(const char *head, size_t size) {
     std::string_view text(head, size);
     bool link = false;
     for_each_entry(text, [&link](std::string_view key, std::string_view) {
-        link = link || (key.size() > kSection.size() && equals_nocase(key.substr(0, kSection.size()), kSection));
+        link = link || (key.size() > kPrefix.size() && equals_nocase(key.substr(0, kPrefix.size()), kPrefix));
     });
     return link && text.find('\0') == std::string_view::npos;
 }
@@ -72,8 +70,7 @@ bool read_link(const char *path, LinkTarget *out) {
     UniqueFd fd(::open(path, O_RDONLY | O_CLOEXEC));
     struct stat st{};
     if (!fd || fstat(fd.get(), &st) != 0) {
-        set_last_error(errno == ENOENT ? AUDIO_ERROR_FILE_NOT_FOUND
-                       : errno == EACCES ? AUDIO_ERROR_ACCESS_DENIED : AUDIO_ERROR_READ);
+        set_last_error(error_of_errno(errno, AUDIO_ERROR_READ));
         return false;
     }
     if (st.st_size > static_cast<off_t>(kMaxLinkSize)) {

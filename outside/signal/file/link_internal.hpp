@@ -1,12 +1,14 @@
 // Link documents: small ini files that name an audio file and carry the
-// options of the document opened through them.
+// options of the document opened through them.  The layout is the settings
+// files' own, so the document can keep its settings in the same file:
 //
-//   [velm.link]
-//   file=take1.wav          ; relative names start at the link's folder
-//   format=AUTO             ; format string of the named file (default AUTO)
-//   options=NOEDITABLE      ; read by the document, not here
+//   [velm]
+//   link.file=take1.wav     ; relative names start at the link's folder
+//   link.format=AUTO        ; format string of the named file (default AUTO)
+//   link.options=NOEDITABLE ; read by the document, not here
 //
 // Keys may also be written whole before any section ("velm.link.file=...").
+// Section names hold no dots; lines under one that does are not read.
 #pragma once
 
 #include <cstddef>

@@ -26,15 +26,6 @@ namespace {
 // A link naming a link naming... is followed this deep at most.
 constexpr size_t kMaxLinkDepth = 8;
 
-int error_of_errno(int e) {
-    switch (e) {
-        case ENOENT: case ENOTDIR: return AUDIO_ERROR_FILE_NOT_FOUND;
-        case EACCES: case EPERM: return AUDIO_ERROR_ACCESS_DENIED;
-        case ENOMEM: return AUDIO_ERROR_OUT_OF_MEMORY;
-        default: return AUDIO_ERROR_READ;
-    }
-}
-
 // The audio a link document names, presented as the link itself: its
 // container is AUDIO_CONTAINER_LINK so that the document binds its settings
 // to the link file.
@@ -60,7 +51,7 @@ std::unique_ptr<FileReader> open_at(const char *path, const ParsedFormat &format
 std::unique_ptr<FileReader> open_link(const char *path, std::vector<std::string> &chain) {
     char canonical[PATH_MAX];
     if (!realpath(path, canonical)) {
-        set_last_error(error_of_errno(errno));
+        set_last_error(error_of_errno(errno, AUDIO_ERROR_READ));
         return nullptr;
     }
     if (chain.size() >= kMaxLinkDepth || std::find(chain.begin(), chain.end(), canonical) != chain.end()) {
@@ -84,7 +75,7 @@ std::unique_ptr<FileReader> open_at(const char *path, const ParsedFormat &format
     UniqueFd fd(::open(path, O_RDONLY | O_CLOEXEC));
     struct stat st{};
     if (!fd || fstat(fd.get(), &st) != 0) {
-        set_last_error(error_of_errno(errno));
+        set_last_error(error_of_errno(errno, AUDIO_ERROR_READ));
         return nullptr;
     }
     if (!S_ISREG(st.st_mode)) {

@@ -1,11 +1,12 @@
 #include "outside/signal/file/sndfile_reader_internal.hpp"
 
+#include <fcntl.h>
 #include <sndfile.h>
 
 #include <algorithm>
 #include <cstring>
-#include <vector>
 #include <mutex>
+#include <vector>
 
 #include "outside/signal/file/direct_pcm_internal.hpp"
 #include "outside/signal/file/formats_internal.hpp"
@@ -39,6 +40,14 @@ int bytes_per_sample(int coding) {
         case AUDIO_FORMAT_DOUBLE: return 8;
         default: return 1;
     }
+}
+
+// The byte order of a file's samples: libsndfile names it where it differs
+// from the container's own (little-endian AIFF and CAF, big-endian WAVE).
+bool big_endian(int sf_format, int container) {
+    int order = sf_format & SF_FORMAT_ENDMASK;
+    if (order != SF_ENDIAN_FILE) return order == SF_ENDIAN_BIG;  // the host's order is little-endian
+    return container == AUDIO_CONTAINER_AIFF || container == AUDIO_CONTAINER_CAF;
 }
 
 // The SF_INFO that opens a headerless file as the format string says.
@@ -83,10 +92,7 @@ public:
                                    : (size > INT64_MAX / kMaxFramesPerByte ? INT64_MAX : size * kMaxFramesPerByte);
         frames_ = std::min<int64_t>(info.frames, capacity);
         meta_ = metadata_from_sndfile(sf_);
-        if (random_ && (info.format & SF_FORMAT_ENDMASK) != SF_ENDIAN_BIG && DirectPcm::handles(coding) &&
-            (container == AUDIO_CONTAINER_WAVE || container == AUDIO_CONTAINER_RF64 ||
-             container == AUDIO_CONTAINER_W64 || container == AUDIO_CONTAINER_RAW))
-            enable_direct_reads();
+        if (random_ && DirectPcm::handles(coding)) enable_direct_reads(big_endian(info.format, container));
         return AUDIO_ERROR_NONE;
     }
 
@@ -135,14 +141,16 @@ private:
     // Where the samples start is where libsndfile seeks for frame 0; the
     // first frames must then read the same both ways before the direct path
     // is trusted.
-    void enable_direct_reads() {
+    void enable_direct_reads(bool big_endian) {
         if (sf_seek(sf_, 1, SEEK_SET) != 1) return;
         int64_t second = vfile_.file_offset();
         if (sf_seek(sf_, 0, SEEK_SET) != 0) return;
         next_ = 0;
         auto direct = std::make_unique<DirectPcm>(fd_.get(), vfile_.file_offset(), format_.audioFormatKind,
-                                                  format_.numChannels);
+                                                  format_.numChannels, big_endian);
         if (second - vfile_.file_offset() != direct->bytes_per_frame()) return;
+        // Now the length is known exactly: the frames after the first one.
+        frames_ = std::min(frames_, (vfile_.file_size() - vfile_.file_offset()) / direct->bytes_per_frame());
         int64_t n = std::min<int64_t>(frames_, 1024);
         std::vector<float> theirs(static_cast<size_t>(n * format_.numChannels)), ours(theirs.size());
         if (sf_readf_float(sf_, theirs.data(), n) != n || direct->read(0, ours.data(), n) != n) return;
@@ -178,7 +186,7 @@ std::unique_ptr<FileReader> open_sndfile_reader(UniqueFd fd, int64_t size, const
     // "AUTO[sr=..,nc=..]": a file no header describes is read as headerless.
     if (error == AUDIO_ERROR_UNSUPPORTED_FORMAT && format.container == 0 && format.sample_rate && format.channels &&
         raw_info(format, &info)) {
-        UniqueFd again(dup(fd_number));
+        UniqueFd again(fcntl(fd_number, F_DUPFD_CLOEXEC, 0));
         if (!again) {
             set_last_error(AUDIO_ERROR_READ);
             return nullptr;

@@ -2,8 +2,10 @@
 // synced, then renamed over the target, so a failed save leaves the old file
 // as it was and no temporary file behind.
 #include <fcntl.h>
+#include <limits.h>
 #include <sndfile.h>
 #include <strings.h>
+#include <stdlib.h>
 #include <sys/stat.h>
 
 #include <cerrno>
@@ -27,15 +29,6 @@ FileWriter::~FileWriter() = default;
 
 namespace {
 
-int error_of_errno(int e) {
-    switch (e) {
-        case ENOENT: case ENOTDIR: return AUDIO_ERROR_FILE_NOT_FOUND;
-        case EACCES: case EPERM: case EROFS: return AUDIO_ERROR_ACCESS_DENIED;
-        case ENOMEM: return AUDIO_ERROR_OUT_OF_MEMORY;
-        default: return AUDIO_ERROR_WRITE;
-    }
-}
-
 // New files get the permissions the process's umask allows; reading it from
 // /proc avoids umask(), which would change it for every thread meanwhile.
 mode_t new_file_mode() {
@@ -46,37 +39,46 @@ mode_t new_file_mode() {
     return 0644;
 }
 
-// The container a name like "song.flac" asks for; WAVE when nothing matches.
-int container_of_extension(const std::string &path) {
+// The format name a file name like "song.flac" asks for: the type listing
+// the extension, and within it the entry the extension names ("opus");
+// WAVE when nothing matches.
+const char *format_name_of_extension(const std::string &path) {
     size_t dot = path.rfind('.'), slash = path.rfind('/');
-    if (dot == std::string::npos || (slash != std::string::npos && dot < slash)) return AUDIO_CONTAINER_WAVE;
+    if (dot == std::string::npos || (slash != std::string::npos && dot < slash)) return "WAVE";
     std::string ext = path.substr(dot + 1);
     for (int i = 0; i < AUDIO_NumFormatDescrs(); ++i) {
         const AUDIO_FORMAT_DESCR *d = AUDIO_GetFormatDescrByIndex(i);
         if (d->containerKind == AUDIO_CONTAINER_LINK) continue;
         std::string list = std::string(d->extensions) + ",";
-        for (size_t at = 0, comma; (comma = list.find(',', at)) != std::string::npos; at = comma + 1)
-            if (strcasecmp(list.substr(at, comma - at).c_str(), ext.c_str()) == 0) return d->containerKind;
+        for (size_t at = 0, comma; (comma = list.find(',', at)) != std::string::npos; at = comma + 1) {
+            if (strcasecmp(list.substr(at, comma - at).c_str(), ext.c_str()) != 0) continue;
+            for (int e = 0; e < d->numEntries; ++e)
+                if (strcasecmp(d->entries[e].name, ext.c_str()) == 0) return d->entries[e].name;
+            return d->entries[0].name;
+        }
     }
-    return AUDIO_CONTAINER_WAVE;
+    return "WAVE";
 }
 
 // The coding a save stores: the one the format name fixes, else the bit depth
 // of the format string, else the signal's own.
-int choose_coding(const ParsedFormat &f, const _audio_format &signal, int container, int *bits) {
+int choose_coding(const ParsedFormat &f, const _audio_format &signal, int *bits) {
+    if (f.coding == AUDIO_FORMAT_FLAC) {  // integers of 8, 16 or 24 bits
+        *bits = f.bits ? f.bits : signal.bitsPerSample >= 24 ? 24 : signal.bitsPerSample == 8 ? 8 : 16;
+        return (*bits == 8 || *bits == 16 || *bits == 24) ? f.coding : 0;
+    }
     bool named_float = f.coding == AUDIO_FORMAT_FLOAT;
-    if (f.coding && !named_float) {
-        *bits = f.coding == AUDIO_FORMAT_FLAC ? (f.bits ? f.bits : std::min<int>(signal.bitsPerSample, 24)) : 16;
-        if (f.coding == AUDIO_FORMAT_FLAC && *bits != 8 && *bits != 16 && *bits != 24) *bits = f.bits ? 0 : 16;
-        return *bits ? f.coding : 0;
+    if (f.coding && !named_float) {  // lossy encoders take any depth
+        *bits = 16;
+        return f.coding;
     }
     bool floating = named_float || (!f.bits && (signal.audioFormatKind == AUDIO_FORMAT_FLOAT ||
                                                 signal.audioFormatKind == AUDIO_FORMAT_DOUBLE));
     *bits = f.bits ? f.bits : named_float ? (signal.bitsPerSample == 64 ? 64 : 32) : signal.bitsPerSample;
-    int coding = pcm_coding_for_bits(container, *bits, floating);
+    int coding = pcm_coding_for_bits(f.container, *bits, floating);
     if (!coding && !f.bits && !named_float) {  // a depth the container lacks: 16-bit
         *bits = 16;
-        coding = pcm_coding_for_bits(container, 16, false);
+        coding = pcm_coding_for_bits(f.container, 16, false);
     }
     return coding;
 }
@@ -120,7 +122,7 @@ public:
         if (rename(temp_.c_str(), target_.c_str()) != 0) {
             int e = errno;
             fail();
-            set_last_error(error_of_errno(e));
+            set_last_error(error_of_errno(e, AUDIO_ERROR_WRITE));
             return false;
         }
         committed_ = true;
@@ -176,8 +178,11 @@ std::unique_ptr<FileWriter> create_through_link(const std::string &path, const _
     return create_at(target.path, format, tf, meta, depth + 1);
 }
 
-std::unique_ptr<FileWriter> create_at(const std::string &path, const _audio_format &format, const ParsedFormat &f,
+std::unique_ptr<FileWriter> create_at(const std::string &named, const _audio_format &format, const ParsedFormat &f,
                                       const AUDIOMETADATA *meta, int depth) {
+    // Saving over a symbolic link replaces the file it points at, not the link.
+    char real[PATH_MAX];
+    const std::string path = realpath(named.c_str(), real) ? std::string(real) : named;
     struct stat st{};
     bool exists = stat(path.c_str(), &st) == 0;
     if (exists && !S_ISREG(st.st_mode)) {
@@ -186,14 +191,22 @@ std::unique_ptr<FileWriter> create_at(const std::string &path, const _audio_form
     }
     if (f.container == AUDIO_CONTAINER_LINK || (f.container == 0 && exists && is_link_document(path.c_str())))
         return create_through_link(path, format, meta, depth);
-    if ((f.sample_rate && f.sample_rate != format.sampleRate) || (f.channels && f.channels != format.numChannels) ||
-        f.conversion.present) {
+    // Rate and channel keys describe files being read ("AUTO[sr=8000,nc=1]"
+    // becomes "WAVE[sr=8000,nc=1]" once detected); a save always writes the
+    // signal's own rate and channels.
+    if (f.conversion.present) {
         set_last_error(AUDIO_ERROR_BAD_FORMAT_STRING);
         return nullptr;
     }
-    int container = f.container ? f.container : container_of_extension(path);
+    ParsedFormat chosen = f;
+    if (!f.container) {
+        const FormatName *name = find_format_name(format_name_of_extension(path));
+        chosen.container = name->container;
+        chosen.coding = name->coding;
+    }
+    int container = chosen.container;
     int bits = 0;
-    int coding = choose_coding(f, format, container, &bits);
+    int coding = choose_coding(chosen, format, &bits);
     bool wave = container == AUDIO_CONTAINER_WAVE;
     int sf = coding ? sf_format_of(wave ? AUDIO_CONTAINER_RF64 : container, coding, bits) : 0;
     if (!sf) {
@@ -204,13 +217,18 @@ std::unique_ptr<FileWriter> create_at(const std::string &path, const _audio_form
 
     size_t slash = path.rfind('/');
     size_t name_at = slash == std::string::npos ? 0 : slash + 1;
-    std::string temp = path.substr(0, name_at) + "." + path.substr(name_at) + ".velmtmp-XXXXXX";
+    // The temporary name must fit where the target's did (255 bytes).
+    std::string temp = path.substr(0, name_at) + "." + path.substr(name_at, 200) + ".velmtmp-XXXXXX";
     UniqueFd fd(mkostemp(temp.data(), O_CLOEXEC));
     if (!fd) {
-        set_last_error(error_of_errno(errno));
+        set_last_error(error_of_errno(errno, AUDIO_ERROR_WRITE));
         return nullptr;
     }
-    // The saved file keeps the permissions of the one it replaces.
+    // The saved file keeps the owner and permissions of the one it replaces;
+    // where the process may not give files away, it becomes ours.
+    if (exists) {
+        [[maybe_unused]] int kept_owner = fchown(fd.get(), st.st_uid, st.st_gid);
+    }
     fchmod(fd.get(), exists ? (st.st_mode & 07777) : new_file_mode());
     auto writer = std::make_unique<SndfileWriter>(path, temp, std::move(fd));
     SF_INFO info{};

@@ -15,9 +15,3 @@ list(APPEND VELMSIGNAL_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/sndfile_reader.cpp
   ${CMAKE_CURRENT_LIST_DIR}/sndfile_writer.cpp
   ${CMAKE_CURRENT_LIST_DIR}/vfile.cpp)
-
-# Until the base services library lands, an empty stand-in lets the signal
-# library link; nothing in this part calls it.
-if(NOT TARGET velmbase)
-  add_library(velmbase INTERFACE)
-endif()

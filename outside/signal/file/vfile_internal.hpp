@@ -17,6 +17,7 @@ public:
     static SF_VIRTUAL_IO *io();  // the callbacks; user data is the VirtualFile
     bool failed() const { return failed_; }  // a read or write error happened
     int64_t file_offset() const { return base_ + pos_; }  // where libsndfile is in the file
+    int64_t file_size() const { return base_ + length_; }
 
 private:
     static sf_count_t get_filelen(void *self);

@@ -62,6 +62,9 @@ bool StartPainter(_VELMCANVASDATA *d, QPixmap *pixmap);
 bool ResumeTarget(_VELMCANVASDATA *d);
 // Target numbers 1-3 name the three pixmaps; anything else the current one.
 QPixmap *TargetPixmap(_VELMCANVASDATA *d, int target);
+// A caller's rectangle as a QRect, cut to a range far beyond any surface so
+// that no edge arithmetic can overflow; a negative size gives an empty one.
+QRect SafeRect(int x, int y, int width, int height);
 // A 0x00BBGGRR word as a colour of the given alpha.
 QColor ToColor(uint32_t color, int alpha);
 // False unless the host made a QGuiApplication, which pixmaps need.

@@ -6,6 +6,7 @@
 #include <QImage>
 #include <QImageReader>
 
+#include <algorithm>
 #include <climits>
 #include <new>
 
@@ -90,7 +91,7 @@ int _PasteImageScaled(_VELMCANVASDATA *d, VELMCANVASIMAGE image, int x, int y, i
 {
     QPainter *painter = Painting(d);
     if (!painter || !image || width <= 0 || height <= 0) return 0;
-    DrawScaled(painter, QRect(x, y, width, height), *AsPixmap(image));
+    DrawScaled(painter, SafeRect(x, y, width, height), *AsPixmap(image));
     return 1;
 }
 
@@ -102,7 +103,7 @@ int _DrawImage(_VELMCANVASDATA *d, int x, int y, int width, int height, const ch
     const QImage image = reader.read();
     if (image.isNull()) return 0;
     const QSize fitted = image.size().scaled(width, height, Qt::KeepAspectRatio);
-    DrawScaled(painter, QRect(QPoint(x, y), fitted), QPixmap::fromImage(image));
+    DrawScaled(painter, SafeRect(x, y, fitted.width(), fitted.height()), QPixmap::fromImage(image));
     return 1;
 }
 
@@ -120,8 +121,10 @@ int _PutImage(_VELMCANVASDATA *d, int x, int y, int width, int height, const voi
                        : QImage(data, image_width, image_height, image_width * 4, QImage::Format_ARGB32_Premultiplied);
     if (format == VELMIMAGEFORMAT_INDEXED8) image.setColorTable(d->color_table);
     // Source rows are counted from the bottom of the image.
-    const QRect source(source_x, image_height - source_y - source_height, source_width, source_height);
-    painter->drawImage(QRect(x, y, width, height), image, source);
+    const long long source_top = static_cast<long long>(image_height) - source_y - source_height;
+    const QRect source = SafeRect(source_x, static_cast<int>(std::clamp<long long>(source_top, INT_MIN, INT_MAX)),
+                                  source_width, source_height);
+    painter->drawImage(SafeRect(x, y, width, height), image, source);
     return 1;
 }
 

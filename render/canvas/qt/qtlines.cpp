@@ -50,11 +50,12 @@ int _DrawLine(_VELMCANVASDATA *d, int x1, int y1, int x2, int y2)
     if (!painter) return 0;
     // Going right or down the last pixel is left out; going left or up the
     // line starts one pixel past the first point.  Callers rely on both.
+    qreal start_x = x1, start_y = y1;
     if (x1 < x2) --x2;
-    else if (x1 > x2) ++x1;
+    else if (x1 > x2) ++start_x;
     if (y1 < y2) --y2;
-    else if (y1 > y2) ++y1;
-    painter->drawLine(Centre(x1, y1), Centre(x2, y2));
+    else if (y1 > y2) ++start_y;
+    painter->drawLine(QPointF(start_x + 0.5, start_y + 0.5), Centre(x2, y2));
     d->current_point = QPoint(x2, y2);
     return 1;
 }
@@ -68,7 +69,8 @@ int _DrawPoint(_VELMCANVASDATA *d, int x, int y, uint32_t color)
     pen.setColor(ToColor(color, 255));
     painter->save();
     painter->setPen(pen);
-    painter->drawPoint(Centre(x, y));
+    // Qt places an integer point on its pixel whatever the antialiasing.
+    painter->drawPoint(QPoint(x, y));
     painter->restore();
     return 1;
 }

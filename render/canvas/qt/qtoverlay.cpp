@@ -7,7 +7,7 @@ namespace velm::canvas::qt {
 int _SaveOverlay(_VELMCANVASDATA *d, int x, int y, int width, int height)
 {
     if (!Painting(d)) return 0;
-    QRegion fresh(x, y, width, height);
+    QRegion fresh(SafeRect(x, y, width, height));
     if (d->saved_overlay) {
         fresh -= *d->saved_overlay;
         *d->saved_overlay += fresh;

@@ -125,12 +125,12 @@ int _BorderRect(_VELMCANVASDATA *d, int x, int y, int width, int height, int cor
 
 int _FillHorzGradientRect(_VELMCANVASDATA *d, int x, int y, int width, int height, uint32_t options)
 {
-    return GradientRect(d, x, y, width, height, options, QPointF(x + width, y));
+    return GradientRect(d, x, y, width, height, options, QPointF(qreal(x) + width, y));
 }
 
 int _FillVertGradientRect(_VELMCANVASDATA *d, int x, int y, int width, int height, uint32_t options)
 {
-    return GradientRect(d, x, y, width, height, options, QPointF(x, y + height));
+    return GradientRect(d, x, y, width, height, options, QPointF(x, qreal(y) + height));
 }
 
 int _ShadowRect(_VELMCANVASDATA *d, int x, int y, int width, int height, int size, int corner,
@@ -150,7 +150,7 @@ int _ShadowRect(_VELMCANVASDATA *d, int x, int y, int width, int height, int siz
     const qreal inset_tr = (corner_bits & kSquareTopRight) ? 0 : half;
     const qreal inset_bl = (corner_bits & kSquareBottomLeft) ? 0 : half;
     const qreal inset_br = (corner_bits & kSquareBottomRight) ? 0 : half;
-    const qreal x0 = x, y0 = y, x1 = x + width, y1 = y + height;
+    const qreal x0 = x, y0 = y, x1 = x0 + width, y1 = y0 + height;
 
     painter->save();
     painter->setPen(Qt::NoPen);
@@ -203,11 +203,11 @@ int _DrawAlphaRect(_VELMCANVASDATA *d, int x, int y, int width, int height, int 
     switch (kind) {
     case VELMCANVASALPHA_DARKRIGHT:
     case VELMCANVASALPHA_DARKLEFT:
-        gradient = QLinearGradient(x, y, x + width, y);
+        gradient = QLinearGradient(x, y, qreal(x) + width, y);
         break;
     case VELMCANVASALPHA_DARKTOP:
     case VELMCANVASALPHA_DARKBOTTOM:
-        gradient = QLinearGradient(x, y + height, x, y);
+        gradient = QLinearGradient(x, qreal(y) + height, x, y);
         break;
     default:
         return 0;
@@ -217,7 +217,7 @@ int _DrawAlphaRect(_VELMCANVASDATA *d, int x, int y, int width, int height, int 
     gradient.setColorAt(1, dark_at_end ? dark : clear);
     painter->save();
     painter->setPen(Qt::NoPen);
-    painter->fillRect(QRect(x, y, width, height), gradient);
+    painter->fillRect(SafeRect(x, y, width, height), gradient);
     painter->restore();
     return 1;
 }

@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <new>
+#include <optional>
 
 namespace velm::canvas::qt {
 namespace {
@@ -22,6 +23,31 @@ QPixmap TransparentPixmap(int width, int height)
     return pixmap;
 }
 
+// Coordinates are kept within this reach of the origin.
+constexpr long long kReach = 1LL << 24;
+
+int Clamped(long long value)
+{
+    return static_cast<int>(std::clamp(value, -kReach, kReach));
+}
+
+// The part of an area that lies on the pixmap, and where it lands when the
+// area is moved to (dest_x, dest_y).  Copying only that part keeps absurd
+// areas cheap; nothing when no part lies on the pixmap.
+struct Block {
+    QPixmap pixels;
+    QPoint dest;
+};
+
+std::optional<Block> CopyBlock(const QPixmap &from, int x, int y, int width, int height, int dest_x, int dest_y)
+{
+    const QRect part = SafeRect(x, y, width, height) & from.rect();
+    if (part.isEmpty()) return std::nullopt;
+    const QPoint dest(Clamped(static_cast<long long>(dest_x) + part.left() - x),
+                      Clamped(static_cast<long long>(dest_y) + part.top() - y));
+    return Block{from.copy(part), dest};
+}
+
 void ApplyHints(QPainter *painter, bool low_profile)
 {
     painter->setRenderHint(QPainter::Antialiasing, !low_profile);
@@ -30,6 +56,14 @@ void ApplyHints(QPainter *painter, bool low_profile)
 }
 
 } // namespace
+
+QRect SafeRect(int x, int y, int width, int height)
+{
+    const int left = Clamped(x), top = Clamped(y);
+    const int right = Clamped(static_cast<long long>(x) + std::max(width, 0));
+    const int bottom = Clamped(static_cast<long long>(y) + std::max(height, 0));
+    return QRect(left, top, right - left, bottom - top);
+}
 
 bool HaveGuiApplication()
 {
@@ -137,8 +171,12 @@ _VELMCANVASDATA *_CreateCanvas(void *, int width, int height)
 int _DestroyCanvas(_VELMCANVASDATA *d)
 {
     if (!d) return 0;
-    // The host keeps its painter: it must not stay on a pixmap that goes away.
-    if (d->painter && d->painter->isActive()) d->painter->end();
+    // The host keeps its painter: it must not stay on a pixmap that goes
+    // away, but may by now be painting another canvas.
+    if (d->painter && d->painter->isActive()) {
+        const QPaintDevice *device = d->painter->device();
+        if (device == &d->output || device == &d->memory || device == &d->overlay) d->painter->end();
+    }
     delete d;
     return 1;
 }
@@ -251,10 +289,11 @@ int _MoveBlock(_VELMCANVASDATA *d, int x, int y, int width, int height, int dest
     QPainter *painter = Painting(d);
     if (!painter) return 0;
     // Through a copy, so that overlapping areas move intact.
-    const QPixmap block = d->target->copy(x, y, width, height);
+    const std::optional<Block> block = CopyBlock(*d->target, x, y, width, height, dest_x, dest_y);
+    if (!block) return 1;
     painter->save();
     painter->setCompositionMode(QPainter::CompositionMode_Source);
-    painter->drawPixmap(dest_x, dest_y, block);
+    painter->drawPixmap(block->dest, block->pixels);
     painter->restore();
     return 1;
 }
@@ -263,12 +302,22 @@ int _MoveBlock2(_VELMCANVASDATA *d, int source, int x, int y, int width, int hei
                 int dest_x, int dest_y)
 {
     if (!Painting(d)) return 0;
-    const QPixmap block = TargetPixmap(d, source)->copy(x, y, width, height);
+    const std::optional<Block> block = CopyBlock(*TargetPixmap(d, source), x, y, width, height, dest_x, dest_y);
+    if (!block) return 1;
     if (!StartPainter(d, TargetPixmap(d, destination))) return 0;
     d->painter->setCompositionMode(QPainter::CompositionMode_Source);
-    d->painter->drawPixmap(dest_x, dest_y, block);
+    d->painter->drawPixmap(block->dest, block->pixels);
     return ResumeTarget(d);
 }
+
+namespace {
+
+QRect DrawArea(const _VELMCANVASDATA *d)
+{
+    return SafeRect(d->draw_area.left, d->draw_area.top, d->draw_area.width, d->draw_area.height);
+}
+
+} // namespace
 
 int _SetDrawArea(_VELMCANVASDATA *d, const _VELMRECT *rect)
 {
@@ -276,7 +325,7 @@ int _SetDrawArea(_VELMCANVASDATA *d, const _VELMRECT *rect)
     if (!painter) return 0;
     d->draw_area = *rect;
     ++d->clip_depth;
-    d->clip = QRegion(rect->left, rect->top, rect->width, rect->height);
+    d->clip = QRegion(DrawArea(d));
     painter->setClipRegion(*d->clip);
     return 1;
 }
@@ -285,10 +334,8 @@ int _ProtectDrawArea(_VELMCANVASDATA *d, const _VELMRECT *rect)
 {
     QPainter *painter = Painting(d);
     if (!painter) return 0;
-    QRegion region = QRegion(0, 0, d->width, d->height) - QRegion(rect->left, rect->top, rect->width, rect->height);
-    if (d->clip_depth != 0) {
-        region &= QRegion(d->draw_area.left, d->draw_area.top, d->draw_area.width, d->draw_area.height);
-    }
+    QRegion region = QRegion(0, 0, d->width, d->height) - SafeRect(rect->left, rect->top, rect->width, rect->height);
+    if (d->clip_depth != 0) region &= DrawArea(d);
     d->clip = region;
     painter->setClipRegion(region);
     ++d->clip_depth;
@@ -302,7 +349,7 @@ int _ClearDrawArea(_VELMCANVASDATA *d)
     painter->setClipping(false);
     d->clip.reset();
     if (d->clip_depth >= 2) {
-        d->clip = QRegion(d->draw_area.left, d->draw_area.top, d->draw_area.width, d->draw_area.height);
+        d->clip = QRegion(DrawArea(d));
         painter->setClipRegion(*d->clip);
     }
     if (d->clip_depth > 0) --d->clip_depth;

@@ -63,7 +63,7 @@ int _TextOut(_VELMCANVASDATA *d, int x, int y, const char *text)
     QPainter *painter = Painting(d);
     if (!painter) return 0;
     painter->save();
-    const int baseline = y + painter->fontMetrics().ascent() + 1;
+    const qreal baseline = qreal(y) + painter->fontMetrics().ascent() + 1;
     DrawShadowedText(d, painter, QPointF(x, baseline), _Convert2QString(text));
     painter->restore();
     return 1;

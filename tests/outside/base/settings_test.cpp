@@ -1,6 +1,8 @@
 #include "base_test_support.h"
 
 #include <string>
+#include <thread>
+#include <vector>
 
 using Settings = BaseTest;
 
@@ -47,9 +49,9 @@ TEST_F(Settings, BracketedReadsFallBackInOrder)
     EXPECT_DOUBLE_EQ(BLSETTINGS_GetFloatEx(nullptr, "libvelm.missing"), 0.0);
     EXPECT_EQ(BLSETTINGS_GetBoolEx(nullptr, "libvelm.missing"), 0);
 
-    // The bracketed default beats the registered one; a value beats both.
+    // A registered default beats the bracketed one; a value beats both.
     BLSETTINGS_SetDefaultEx(nullptr, "libvelm.spectral.preset=wide");
-    EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset=[narrow]"), "narrow");
+    EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset=[narrow]"), "wide");
     EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset"), "wide");
     BLSETTINGS_ChangeEx(nullptr, "libvelm.spectral.preset=custom");
     EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.spectral.preset=[narrow]"), "custom");
@@ -200,4 +202,25 @@ TEST(SettingsFinalize, LastFinalizeClearsTheRegistry)
     EXPECT_GT(BLSETTINGS_GetTimeStampEx(nullptr), before);
     EXPECT_EQ(BLSETTINGS_GetIntEx(doc, "f.x"), 1) << "objects belong to their creators";
     EXPECT_EQ(BLSETTINGS_Destroy(doc), 1);
+}
+
+TEST_F(Settings, ConcurrentChangesAndReadsStayConsistent)
+{
+    BLSETTINGS doc = BLSETTINGS_Create();
+    std::vector<std::thread> workers;
+    for (int t = 0; t < 4; ++t)
+        workers.emplace_back([t, doc] {
+            for (int i = 0; i < 300; ++i) {
+                BLSETTINGS_ChangeEx(nullptr, "par.thread%d=%d", t, i);
+                BLSETTINGS_ChangeEx(doc, "par.shared=%d", i);
+                if (i % 50 == 0) BLSETTINGS_Insert(doc);
+                if (i % 50 == 25) BLSETTINGS_Remove(doc);
+                const int seen = BLSETTINGS_GetIntEx(nullptr, "par.thread%d", t);
+                ASSERT_EQ(seen, i) << "a thread reads its own last value";
+                BLSETTINGS_GetStringEx(nullptr, "par.shared=[none]");
+            }
+        });
+    for (auto &w : workers) w.join();
+    EXPECT_EQ(BLSETTINGS_GetIntEx(doc, "par.shared"), 299);
+    BLSETTINGS_Destroy(doc);
 }

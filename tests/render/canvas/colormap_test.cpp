@@ -59,12 +59,4 @@ TEST(ColorMaps, HeatRampPassesThroughItsFixedPointsSmoothly)
     }
 }
 
-TEST(QtEntryPoints, NeedAnApplicationMadeByTheHost)
-{
-    // This executable never makes a QGuiApplication.
-    EXPECT_EQ(VELMCANVAS_CreateCanvasQT(nullptr, 100, 100), nullptr);
-    const unsigned char png_signature[] = {0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'};
-    EXPECT_EQ(VELMCANVAS_LoadImageQT(png_signature, sizeof png_signature), nullptr);
-}
-
 } // namespace

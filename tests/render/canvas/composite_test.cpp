@@ -11,11 +11,8 @@ using Calls = std::vector<std::string>;
 
 namespace {
 
-class Composite : public ::testing::Test {
+class Composite : public velm::test::RecordingCanvas {
 protected:
-    void SetUp() override { canvas = rec.MakeCanvas(400, 200); }
-    void TearDown() override { VELMCANVAS_DestroyCanvas(canvas); }
-
     Calls Drawn() const
     {
         Calls drawn;
@@ -27,8 +24,6 @@ protected:
         return drawn;
     }
 
-    Recorder rec;
-    VELMCANVAS canvas = nullptr;
 };
 
 TEST_F(Composite, SharpRectanglesMayReachJustPastTheEdges)
@@ -206,12 +201,6 @@ TEST_F(Composite, ARectangleNarrowerThanTheEllipsisShowsNothingThatDoesNotFit)
     const _VELMRECT rect{0, 0, 24, 30, 0, 0};
     VELMCANVAS_FillRectangleText(canvas, &rect, "abcdefgh", VELMCANVASTEXT_ELLIPSIS);
     EXPECT_TRUE(Drawn().empty());
-}
-
-TEST_F(Composite, TheBevelFrameIsConstrainedFirst)
-{
-    EXPECT_EQ(VELMCANVAS_BevelRect(canvas, 10, 10, -3, 40), 0);
-    EXPECT_EQ(VELMCANVAS_BevelRect(canvas, 10, 10, 50, 40), 1);
 }
 
 } // namespace

@@ -11,13 +11,8 @@ using velm::test::Recorder;
 
 namespace {
 
-class Guards : public ::testing::Test {
+class Guards : public velm::test::RecordingCanvas {
 protected:
-    void SetUp() override { canvas = rec.MakeCanvas(400, 200); }
-    void TearDown() override { VELMCANVAS_DestroyCanvas(canvas); }
-
-    Recorder rec;
-    VELMCANVAS canvas = nullptr;
     FakeImage image{"img", 30, 20};
     _VELMRECT rect{10, 10, 50, 40, 59, 49};
     _VELMCANVASFONT font{"Tahoma", 9.0f, 0, {0, 0, 0, 0}};

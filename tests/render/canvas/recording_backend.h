@@ -6,6 +6,8 @@
 
 #include "render/canvas/velmcanvas.h"
 
+#include <gtest/gtest.h>
+
 #include <set>
 #include <string>
 #include <vector>
@@ -44,6 +46,16 @@ public:
     std::vector<std::string> CallsOf(const std::string &prefix) const;
 
     static Recorder *Current();
+};
+
+// A 400 x 200 canvas on a fresh recording back-end, no call recorded yet.
+class RecordingCanvas : public ::testing::Test {
+protected:
+    void SetUp() override { canvas = rec.MakeCanvas(400, 200); }
+    void TearDown() override { VELMCANVAS_DestroyCanvas(canvas); }
+
+    Recorder rec;
+    VELMCANVAS canvas = nullptr;
 };
 
 } // namespace velm::test

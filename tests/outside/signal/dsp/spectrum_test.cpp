@@ -186,3 +186,37 @@ TEST(SignalDspSpectrum, PreEmphasisWeightsMatchFilteringTheSignal)
     EXPECT_EQ(DSPB_CreatePreEmphAdjust(nullptr, n, 0.9), 0);
     EXPECT_EQ(DSPB_CreatePreEmphAdjust(flat.data(), n, NAN), 0);
 }
+
+TEST(SignalDspSpectrum, SpectrogramLevelsOfSilenceAndFullScaleStayInRange)
+{
+    // A spectrogram column as the "wide" preset makes it: a 40-sample
+    // blackman frame in a 256-point FFT with pre-emphasis, shown over 110 dB
+    // as 16-bit levels 65535 dB / D + 65535.
+    const int n = 256, length = 40;
+    const double range = 110.0;
+    std::vector<float> window(length), weights(n);
+    ASSERT_EQ(DSPB_CreateWindow(DSPB_WINDOW_BLACKMAN, window.data(), length), 1);
+    ASSERT_EQ(DSPB_CreatePreEmphAdjust(weights.data(), n, 0.9), 1);
+    const double norm = DSPB_GetWindowNormFactor(window.data(), length);
+    dsptest::Proc proc(DSPB_FFTProcCreate(n));
+
+    auto levels = [&](std::vector<float> frame) {
+        frame.resize(n, 0.0f);
+        DSPB_ApplyWindow(window.data(), frame.data(), length);
+        std::vector<float> db(n / 2 + 1);
+        EXPECT_EQ(DSPB_FFTProcExecutePSD(proc.get(), frame.data(), db.data()), n / 2 + 1);
+        EXPECT_EQ(DSPB_PSDtoDB(n, db.data(), db.data(), weights.data(), norm, range), n / 2 + 1);
+        std::vector<double> out;
+        for (float v : db)
+            out.push_back(65535.0 * v / range + 65535.0);
+        return out;
+    };
+    for (double level : levels(std::vector<float>(length, 0.0f)))
+        EXPECT_EQ(level, 0.0);
+    const auto loud = levels(sine(length, 1.0, 32, n));  // bin 32 is 5.5 kHz at 44.1 kHz
+    for (double level : loud) {
+        EXPECT_GE(level, 0.0);
+        EXPECT_LE(level, 65535.0);
+    }
+    EXPECT_GT(*std::max_element(loud.begin(), loud.end()), 65535.0 * (1.0 - 3.0 / range));
+}

@@ -2,6 +2,8 @@
 #include <gtest/gtest.h>
 #include <sndfile.h>
 
+#include "outside/base/blbase.h"
+
 #include "tests/outside/signal/file/reader_helpers.hpp"
 
 using namespace velmsig;
@@ -20,7 +22,7 @@ protected:
 };
 
 TEST_F(Link, OpensTheNamedAudioRelativeToTheLinkFolder) {
-    write_text(dir_.file("take.velmlink"), "; a comment\n[velm.link]\nfile = take.wav\noptions=NOEDITABLE\n");
+    write_text(dir_.file("take.velmlink"), "; a comment\n[velm]\nlink.file = take.wav\nlink.options=NOEDITABLE\n");
     for (const char *text : {"AUTO", "LINK"}) {
         auto reader = open_reader(dir_.file("take.velmlink").c_str(), text);
         ASSERT_NE(reader, nullptr) << text << " " << AUDIOSIGNAL_GetLastError();
@@ -44,38 +46,64 @@ TEST_F(Link, TakesWholeKeysAndAFormatString) {
 }
 
 TEST_F(Link, RefusesLoopsMissingTargetsAndBadFormats) {
-    write_text(dir_.file("self.velmlink"), "[velm.link]\nfile=self.velmlink\n");
+    write_text(dir_.file("self.velmlink"), "[velm]\nlink.file=self.velmlink\n");
     EXPECT_EQ(open_reader(dir_.file("self.velmlink").c_str(), "AUTO"), nullptr);
     EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_CORRUPT_DATA);
 
-    write_text(dir_.file("a.velmlink"), "[velm.link]\nfile=b.velmlink\n");
-    write_text(dir_.file("b.velmlink"), "[velm.link]\nfile=./a.velmlink\n");
+    write_text(dir_.file("a.velmlink"), "[velm]\nlink.file=b.velmlink\n");
+    write_text(dir_.file("b.velmlink"), "[velm]\nlink.file=./a.velmlink\n");
     EXPECT_EQ(open_reader(dir_.file("a.velmlink").c_str(), "AUTO"), nullptr);
     EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_CORRUPT_DATA);
 
-    write_text(dir_.file("gone.velmlink"), "[velm.link]\nfile=gone.wav\n");
+    write_text(dir_.file("gone.velmlink"), "[velm]\nlink.file=gone.wav\n");
     EXPECT_EQ(open_reader(dir_.file("gone.velmlink").c_str(), "AUTO"), nullptr);
     EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_FILE_NOT_FOUND);
 
-    write_text(dir_.file("nofile.velmlink"), "[velm.link]\noptions=EDITABLE\n");
+    write_text(dir_.file("nofile.velmlink"), "[velm]\nlink.options=EDITABLE\n");
     EXPECT_EQ(open_reader(dir_.file("nofile.velmlink").c_str(), "LINK"), nullptr);
     EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_CORRUPT_DATA);
 
-    write_text(dir_.file("badfmt.velmlink"), "[velm.link]\nfile=take.wav\nformat=WAVE[sr=oops]\n");
+    write_text(dir_.file("badfmt.velmlink"), "[velm]\nlink.file=take.wav\nlink.format=WAVE[sr=oops]\n");
     EXPECT_EQ(open_reader(dir_.file("badfmt.velmlink").c_str(), "AUTO"), nullptr);
     EXPECT_EQ(AUDIOSIGNAL_GetLastError(), AUDIO_ERROR_BAD_FORMAT_STRING);
 
     // Chains of links are followed, but not endlessly.
     for (int i = 0; i < 12; ++i)
         write_text(dir_.file("c" + std::to_string(i) + ".velmlink"),
-                   "[velm.link]\nfile=c" + std::to_string(i + 1) + ".velmlink\n");
-    write_text(dir_.file("c12.velmlink"), "[velm.link]\nfile=take.wav\n");
+                   "[velm]\nlink.file=c" + std::to_string(i + 1) + ".velmlink\n");
+    write_text(dir_.file("c12.velmlink"), "[velm]\nlink.file=take.wav\n");
     EXPECT_NE(open_reader(dir_.file("c6.velmlink").c_str(), "AUTO"), nullptr);
     EXPECT_EQ(open_reader(dir_.file("c0.velmlink").c_str(), "AUTO"), nullptr);
 }
 
+// The document keeps its settings in the link file through the settings
+// library: what one writes, the other reads.
+TEST_F(Link, SharesItsFileWithTheSettingsLibrary) {
+    BLCORE_Initialize();
+    std::string path = dir_.file("shared.velmlink");
+    BLSETTINGS settings = BLSETTINGS_Create();
+    ASSERT_EQ(BLSETTINGS_SetConfigFileEx(settings, path.c_str(), "ini"), 1);
+    ASSERT_EQ(BLSETTINGS_ChangeEx(settings, "velm.link.file=take.wav"), 1);
+    ASSERT_EQ(BLSETTINGS_ChangeEx(settings, "velm.link.options=NOEDITABLE"), 1);
+    BLSETTINGS_Destroy(settings);
+    auto reader = open_reader(path.c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr) << slurp(path);
+    EXPECT_EQ(read_all(*reader), samples_);
+
+    write_text(path, "[velm]\nlink.file=take.wav\nlink.options=NOEDITABLE\n");
+    settings = BLSETTINGS_Create();
+    ASSERT_EQ(BLSETTINGS_SetConfigFileEx(settings, path.c_str(), "ini"), 1);
+    EXPECT_STREQ(BLSETTINGS_GetStringEx(settings, "velm.link.options"), "NOEDITABLE");
+    BLSETTINGS_Destroy(settings);
+    BLCORE_Finalize();
+
+    // A dotted section is not one the settings library reads: neither do we.
+    write_text(path, "[velm.link]\nfile=take.wav\n");
+    EXPECT_EQ(open_reader(path.c_str(), "AUTO"), nullptr);
+}
+
 TEST_F(Link, SavingThroughALinkWritesTheNamedAudio) {
-    std::string link_text = "[velm.link]\nfile=take.wav\n";
+    std::string link_text = "[velm]\nlink.file=take.wav\n";
     write_text(dir_.file("take.velmlink"), link_text);
     auto louder = test_signal(2, 300);
     _audio_format f = AUDIO_InitFormat(48000, 2, 16);

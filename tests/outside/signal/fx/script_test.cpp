@@ -201,3 +201,13 @@ TEST(ProcessSamples, EmptyInputHandsOutWhatWaits)
     EXPECT_EQ(AUDIOFX_ProcessSamples(path, nullptr, 0, out, 3), 0);
     AUDIOFX_DestroyPath(path);
 }
+
+TEST(Script, AbsurdLengthAndBlockHintsAreHarmless)
+{
+    AUDIOFX *path =
+        AUDIOFX_CreatePathEx(format(44100, 2), INT64_MAX, INT64_MAX, "fmtconv[sr=48000,nc=8]:fadeout");
+    ASSERT_NE(path, nullptr);
+    const auto out = run_path(path, std::vector<float>(2 * 4410, 0.5f), 2);
+    EXPECT_NEAR(static_cast<double>(out.size()), 8 * 4800, 8 * 3);
+    AUDIOFX_DestroyPath(path);
+}
