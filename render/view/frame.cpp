@@ -13,6 +13,9 @@ using namespace velm::view;
 namespace {
 
 constexpr uint32_t kEverything = 0x80001C18u;
+// Larger views cannot be painted (the canvas back-end's limit) and would only
+// size the buffers absurdly.
+constexpr int32_t kMaxViewSize = 32767;
 
 template <typename Hook, typename... Args>
 int call_hook(Hook hook, Args... args)
@@ -226,7 +229,9 @@ int VELMDRAW_UpdateViewWindow(VELMDRAW d)
 
 int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _VELMRECT *changed)
 {
-    if (!d || !canvas || !state || state->drawWidth <= 0 || state->drawHeight <= 0) return 0;
+    if (!d || !canvas || !state || state->drawWidth <= 0 || state->drawHeight <= 0 ||
+        state->drawWidth > kMaxViewSize || state->drawHeight > kMaxViewSize)
+        return 0;
     MutexLock(d->lock);
     VELMSTATE *copy = VELMSTATE_CreateCopy(nullptr, state);
     if (!copy) {

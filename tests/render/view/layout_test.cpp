@@ -147,6 +147,22 @@ TEST(LayoutChannels, EightChannelsShowSix)
     VELMAUDIO_Close(doc);
 }
 
+TEST_F(Layout, AbsurdViewSizesAreRefused)
+{
+    VELMDRAW drawer = VELMDRAW_Create(doc);
+    ASSERT_NE(drawer, nullptr);
+    VELMSTATE *state = VELMSTATE_CreateCopy(nullptr, VELMAUDIO_GetState(doc));
+    state->drawWidth = 1 << 30;
+    state->drawHeight = 300;
+    EXPECT_EQ(VELMDRAW_UpdateDraw(drawer, canvas.get(), state, nullptr), 0);
+    state->drawWidth = 300;
+    state->drawHeight = -4;
+    EXPECT_EQ(VELMDRAW_UpdateDraw(drawer, canvas.get(), state, nullptr), 0);
+    EXPECT_LT(VELMDRAW_SizeInMemory(drawer), 1 << 20);
+    VELMSTATE_Destroy(state);
+    EXPECT_EQ(VELMDRAW_Destroy(drawer), 1);
+}
+
 TEST(LayoutGuards, NullArgumentsFail)
 {
     _VELMRECT r{};
