@@ -5,6 +5,7 @@
 #include <string>
 
 #include "core/document_internal.hpp"
+#include "render/view/velmdraw.h"
 #include "core/startup_internal.hpp"
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
@@ -143,6 +144,8 @@ int close_document(VELMAUDIO doc)
         BLNOTIFY_DestroyDispatcher(doc->dispatcher);
         doc->dispatcher = nullptr;
     }
+    VELMDRAW_Destroy(doc->renderer);
+    doc->renderer = nullptr;
     if (doc->signal) AUDIOSIGNAL_Destroy(doc->signal);
     if (doc->state) VELMSTATE_Destroy(doc->state);
     VELMUNDO_DestroyStack(doc);
@@ -306,7 +309,9 @@ static int release_reference(VELMAUDIO doc)
 static int unload(VELMAUDIO doc)
 {
     VELMSTATE *state = doc->state;
-    if (!(state->status & STATUS_HAS_FILE) || (state->status & STATUS_MODIFIED)) return 0;
+    if (!(state->status & STATUS_HAS_FILE) || (state->status & STATUS_MODIFIED) || doc->drawing) return 0;
+    VELMDRAW_Destroy(doc->renderer);
+    doc->renderer = nullptr;
     if (doc->signal) AUDIOSIGNAL_Destroy(VELMAUDIO_SetAudioSignal(doc, nullptr));
     VELMUNDO_DestroyStack(doc);
     if (doc->settings) {

@@ -17,7 +17,7 @@ struct _VELMAUDIO {
     VELMSTATE   *state;
     AUDIOSIGNAL *signal;
     struct VELMUNDOSTACK *undo; // undo stack, created on first use
-    void        *renderer;     // created at the first draw
+    struct _VELMDRAW *renderer; // created at the first draw
     void        *player;       // linked, not owned
     void        *recorder;     // linked, not owned
     BLNOTIFY     dispatcher;

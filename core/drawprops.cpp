@@ -5,6 +5,7 @@
 #include "core/document_internal.hpp"
 #include "core/state_internal.hpp"
 #include "core/velmconfig.h"
+#include "render/view/velmdraw.h"
 
 namespace {
 
@@ -14,14 +15,29 @@ bool has_state(VELMAUDIO doc)
 }
 
 // Until a renderer is attached, the view has no minimum size.
-int32_t minimum_width(VELMAUDIO)
+int32_t minimum_width(VELMAUDIO doc)
 {
-    return 0;
+    return doc->renderer ? VELMDRAW_MinDrawWidth(doc->renderer, doc->state) : 0;
 }
 
-int32_t minimum_height(VELMAUDIO)
+int32_t minimum_height(VELMAUDIO doc)
 {
-    return 0;
+    return doc->renderer ? VELMDRAW_MinDrawHeight(doc->renderer, doc->state) : 0;
+}
+
+// The waveform's share of the lanes, given in pixels; the renderer knows the
+// lanes' height once it has laid them out.
+int set_wave_height(VELMAUDIO doc, int32_t height)
+{
+    if (!doc->renderer) doc->renderer = VELMDRAW_Create(doc);
+    const double fraction = VELMDRAW_ConvertWaveHeightToPerc(doc->renderer, height);
+    if (fraction < 0.0) return 0;
+    const float clamped = static_cast<float>(std::clamp(fraction, 0.2, 0.8));
+    if (doc->state->waveHeightFraction != clamped) {
+        doc->state->waveHeightFraction = clamped;
+        VELMSTATE_NotifyChanges(doc, 0);
+    }
+    return 1;
 }
 
 void store_size(VELMAUDIO doc, int32_t VELMSTATE::*field, int32_t value)
@@ -108,6 +124,7 @@ int VELMAUDIO_SetDrawProperty(VELMAUDIO doc, int kind, int32_t value)
     case 3: return set_scale_kind(doc, "vertscalekind", VELMCONFIG_EncodeVertScaleKind(value), 0x2002A, value);
     case 4: return set_scale_kind(doc, "specscalekind", VELMCONFIG_EncodeSpecScaleKind(value), 0x2002B, value);
     case 5: return set_scale_kind(doc, "horzscalekind", VELMCONFIG_EncodeHorzScaleKind(value), 0x20029, value);
+    case 6: return set_wave_height(doc, value);
     case 7: store_size(doc, &VELMSTATE::navigatorHeight, value); return 1;
     default: return 1;
     }
@@ -124,6 +141,7 @@ int32_t VELMAUDIO_GetDrawProperty(VELMAUDIO doc, int kind)
     case 3: return VELMCONFIG_DecodeVertScaleKind(BLSETTINGS_GetStringEx(nullptr, "libvelm.draw.vertscalekind"), s->vertScaleKind);
     case 4: return VELMCONFIG_DecodeSpecScaleKind(BLSETTINGS_GetStringEx(nullptr, "libvelm.draw.specscalekind"), s->spectralScaleKind);
     case 5: return VELMCONFIG_DecodeHorzScaleKind(BLSETTINGS_GetStringEx(nullptr, "libvelm.draw.horzscalekind"), s->horzScaleKind);
+    case 6: return doc->renderer ? VELMDRAW_ConvertWavePercToHeight(doc->renderer, s->waveHeightFraction) : 0;
     default: return 0;
     }
 }

@@ -4,6 +4,7 @@
 #include <cstdio>
 
 #include "core/document_internal.hpp"
+#include "render/view/velmdraw.h"
 
 namespace {
 
@@ -173,6 +174,7 @@ int64_t VELMAUDIO_SizeInMemory(VELMAUDIO doc)
     if (!doc) return 0;
     int64_t total = BLMEM_SizeInMemory(doc->pool);
     if (doc->signal) total += AUDIOSIGNAL_SizeInMemory(doc->signal);
+    if (doc->renderer) total += VELMDRAW_SizeInMemory(doc->renderer);
     return total;
 }
 
@@ -181,6 +183,11 @@ int VELMAUDIO_FreeMemory(VELMAUDIO doc)
     if (!doc) return 0;
     const int64_t before = VELMAUDIO_SizeInMemory(doc);
     const int ok = doc->signal ? AUDIOSIGNAL_FreeDataMemory(doc->signal) : 1;
+    // The renderer is made again at the next draw.
+    if (doc->renderer && !doc->drawing) {
+        VELMDRAW_Destroy(doc->renderer);
+        doc->renderer = nullptr;
+    }
     const int64_t after = VELMAUDIO_SizeInMemory(doc);
     BLDEBUG_Log(-1, "Size change: %lld -> %lld (%lld bytes freed)", static_cast<long long>(before),
                 static_cast<long long>(after), static_cast<long long>(before - after));

@@ -1,0 +1,152 @@
+// Drawing a one-hour stereo document offscreen: the whole hour at 2000
+// columns (display data computed from the signal's summaries), a scroll by a
+// tenth of a ten-minute window, a zoom step, and the whole hour with
+// spectrogram lanes.
+//
+//   bench_render_waveform     (run with QT_QPA_PLATFORM=offscreen)
+//
+// The 16-bit WAV file (about 635 MB) is made once in the temporary folder.
+#include <benchmark/benchmark.h>
+#include <sndfile.h>
+
+#include <QGuiApplication>
+#include <QPainter>
+#include <cmath>
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include "core/velmaudio.h"
+#include "core/velmconfig.h"
+#include "core/velmnavigation.h"
+#include "render/view/velmdraw.h"
+
+namespace {
+
+constexpr int kRate = 44100;
+constexpr int64_t kFrames = int64_t{3600} * kRate;
+constexpr int kColumns = 2000;
+// No margins, borders or scales: the lanes are exactly kColumns wide.
+constexpr uint32_t kBareFlags = 0x4 | 0x8 | 0x40 | 0x80 | 0x100;
+
+std::string source_path()
+{
+    return (std::filesystem::temp_directory_path() / "velm-bench-render-hour.wav").string();
+}
+
+// Tones whose loudness changes every few seconds, different per channel.
+void make_source()
+{
+    const std::string path = source_path();
+    if (std::filesystem::exists(path) && std::filesystem::file_size(path) == static_cast<uintmax_t>(44 + kFrames * 4)) return;
+    SF_INFO info{};
+    info.samplerate = kRate;
+    info.channels = 2;
+    info.format = SF_FORMAT_WAV | SF_FORMAT_PCM_16;
+    SNDFILE *f = sf_open(path.c_str(), SFM_WRITE, &info);
+    constexpr int64_t chunk = 65536;
+    std::vector<short> block(2 * chunk);
+    for (int64_t at = 0; at < kFrames; at += chunk) {
+        const int64_t n = std::min(chunk, kFrames - at);
+        for (int64_t i = 0; i < n; ++i) {
+            const int64_t t = at + i;
+            const double loud = 0.2 + 0.7 * std::fabs(std::sin(static_cast<double>(t / (kRate * 3)) * 1.7));
+            const double wave = std::sin(static_cast<double>(t % 100) * (2.0 * M_PI / 100.0));
+            block[2 * i] = static_cast<short>(12000 * loud * wave);
+            block[2 * i + 1] = static_cast<short>(9000 * loud * wave * (t % 7 == 0 ? -1 : 1));
+        }
+        sf_writef_short(f, block.data(), n);
+    }
+    sf_close(f);
+}
+
+struct Session {
+    VELMAUDIO doc = nullptr;
+    VELMCANVAS canvas = nullptr;
+
+    Session(uint32_t kind, int height)
+    {
+        static int argc = 1;
+        static char name[] = "bench_render_waveform";
+        static char *argv[] = {name, nullptr};
+        if (!QGuiApplication::instance()) new QGuiApplication(argc, argv);
+        make_source();
+        doc = VELMAUDIO_Open(source_path().c_str(), "AUTO");
+        canvas = VELMCANVAS_CreateCanvasQT(nullptr, kColumns, height);
+        VELMCANVAS_ResizeCanvas(canvas, kColumns, height);
+        VELMAUDIO_SetDrawProperty(doc, 2, static_cast<int32_t>(kBareFlags | kind));
+    }
+    ~Session()
+    {
+        VELMAUDIO_Close(doc);
+        VELMCANVAS_DestroyCanvas(canvas);
+    }
+    bool draw()
+    {
+        QPainter painter;
+        VELMCANVAS_BeginDraw(canvas, &painter);
+        const int ok = VELMAUDIO_Draw(canvas, doc, nullptr);
+        VELMCANVAS_EndDraw(canvas);
+        return ok != 0;
+    }
+};
+
+// The whole hour; the view end moves by one sample each time, so every
+// column is computed anew.
+void whole_hour(benchmark::State &state, uint32_t kind)
+{
+    Session s(kind, 1080);
+    s.draw();
+    int64_t i = 0;
+    for (auto _ : state) {
+        VELMAUDIO_Zoom(s.doc, 0, kFrames - (++i % 2));
+        if (!s.draw()) state.SkipWithError("draw failed");
+    }
+}
+
+void BM_WholeHourWaveform(benchmark::State &state)
+{
+    whole_hour(state, 0x1);
+}
+
+void BM_WholeHourSpectrogram(benchmark::State &state)
+{
+    whole_hour(state, 0x3);
+}
+
+// A ten-minute window scrolled by a tenth of itself, to and fro.
+void BM_ScrollTenth(benchmark::State &state)
+{
+    Session s(0x1, 1080);
+    const int64_t window = int64_t{600} * kRate;
+    VELMAUDIO_Zoom(s.doc, 0, window);
+    s.draw();
+    int64_t at = 0;
+    for (auto _ : state) {
+        at = at == 0 ? window / 10 : 0;
+        VELMAUDIO_Zoom(s.doc, at, at + window);
+        if (!s.draw()) state.SkipWithError("draw failed");
+    }
+}
+
+// Zooming in and out by a factor of two around the middle.
+void BM_ZoomStep(benchmark::State &state)
+{
+    Session s(0x1, 1080);
+    s.draw();
+    bool in = true;
+    for (auto _ : state) {
+        VELMAUDIO_ZoomByFactor(s.doc, kFrames / 2, in ? 0.5 : 2.0);
+        in = !in;
+        if (!s.draw()) state.SkipWithError("draw failed");
+    }
+}
+
+} // namespace
+
+BENCHMARK(BM_WholeHourWaveform)->Unit(benchmark::kMillisecond)->Iterations(20);
+BENCHMARK(BM_ScrollTenth)->Unit(benchmark::kMillisecond)->Iterations(40);
+BENCHMARK(BM_ZoomStep)->Unit(benchmark::kMillisecond)->Iterations(20);
+BENCHMARK(BM_WholeHourSpectrogram)->Unit(benchmark::kMillisecond)->Iterations(10);
+
+BENCHMARK_MAIN();

@@ -1,0 +1,310 @@
+// One frame: the change mask decides between overlays only, a scroll by
+// whole columns and a full redraw of the memory target.
+#include <algorithm>
+#include <cmath>
+
+#include "core/document_internal.hpp"
+#include "core/state_internal.hpp"
+#include "core/velmqueries.h"
+#include "render/view/drawer_internal.hpp"
+
+using namespace velm::view;
+
+namespace {
+
+constexpr uint32_t kEverything = 0x80001C18u;
+// Larger views cannot be painted (the canvas back-end's limit) and would only
+// size the buffers absurdly.
+constexpr int32_t kMaxViewSize = 32767;
+
+template <typename Hook, typename... Args>
+int call_hook(Hook hook, Args... args)
+{
+    return hook ? hook(args...) : 1;
+}
+
+void mark_dirty(VELMDRAW d, int32_t left, int32_t top, int32_t right, int32_t bottom)
+{
+    d->dirty.left = std::min(d->dirty.left, left);
+    d->dirty.top = std::min(d->dirty.top, top);
+    d->dirty.right = std::max(d->dirty.right, right);
+    d->dirty.bottom = std::max(d->dirty.bottom, bottom);
+}
+
+void reset_dirty(VELMDRAW d)
+{
+    d->dirty = _VELMRECT{d->state ? d->state->drawWidth : 0, d->state ? d->state->drawHeight : 0, 0, 0, 0, 0};
+}
+
+bool main_lane(const Lane &lane)
+{
+    return lane.shown && lane.kind != VELMDRAW_LANE_NAVIGATOR;
+}
+
+// Runs fn on every shown lane (only the main ones when asked).
+template <typename Fn>
+int for_lanes(VELMDRAW d, bool main_only, Fn fn)
+{
+    int ok = 1;
+    for (int i = 0; i < d->laneCount; ++i) {
+        Lane &lane = d->lanes[static_cast<size_t>(i)];
+        if (!lane.shown || (main_only && !main_lane(lane))) continue;
+        if (!fn(lane)) ok = 0;
+    }
+    return ok;
+}
+
+int process_lanes(VELMDRAW d, int first, int last, bool main_only)
+{
+    return for_lanes(d, main_only, [&](Lane &lane) {
+        return lane.kind == VELMDRAW_LANE_SPECTROGRAM ? process_spectral(d, &lane, first, last)
+                                                      : process_wave(d, &lane, first, last);
+    });
+}
+
+int draw_lanes(VELMDRAW d, int first, int last, bool main_only)
+{
+    join_workers(d);
+    return for_lanes(d, main_only, [&](Lane &lane) {
+        return lane.kind == VELMDRAW_LANE_SPECTROGRAM ? draw_spectral(d, &lane, first, last)
+                                                      : draw_wave(d, &lane, first, last);
+    });
+}
+
+int draw_lane_backgrounds(VELMDRAW d, int first, int last, bool main_only)
+{
+    const int ok = for_lanes(d, main_only, [&](Lane &lane) { return draw_wave_background(d, &lane, first, last); });
+    if (d->state->viewFlags & 0x1000000u) return ok;
+    for (int t = 0; t < VELM_MAX_CUSTOM_TRACKS; ++t) {
+        if (!d->trackShown[static_cast<size_t>(t)]) continue;
+        if (!BLNOTIFY_SendEvent(d->document->dispatcher, nullptr, 0, 0x20050, nullptr, nullptr)) continue;
+        const _VELMRECT &a = d->trackAreas[static_cast<size_t>(t)];
+        const int from = std::max(first, 0), to = std::min(last, a.width - 1);
+        if (to < from) continue;
+        VELMCANVAS_SelectColor(d->canvas, d->config.customTrackBgBrush);
+        VELMCANVAS_FillRect(d->canvas, a.left + from, a.top, to - from + 1, a.height, 0);
+    }
+    return ok;
+}
+
+// The slow steps for columns first .. last on the memory target.
+int draw_columns(VELMDRAW d, int first, int last, bool main_only)
+{
+    const DrawHooks &hooks = draw_hooks();
+    int ok = process_lanes(d, first, last, main_only);
+    ok &= call_hook(hooks.horzScale, d, first, last);
+    ok &= draw_lane_backgrounds(d, first, last, main_only);
+    ok &= call_hook(hooks.scaleGrids, d, first, last);
+    ok &= call_hook(hooks.regions, d, first, last);
+    ok &= draw_lanes(d, first, last, main_only);
+    return ok;
+}
+
+bool prepare_bases(VELMDRAW d)
+{
+    const int64_t length = AUDIOSIGNAL_NumSamples(d->document->signal);
+    const VELMSTATE *s = d->state;
+    bool ok = prepare_time_base(&d->mainBase, static_cast<double>(s->viewBegin), static_cast<double>(s->viewEnd),
+                                d->columns, length);
+    if (d->navigatorPosition)
+        ok = prepare_time_base(&d->navigatorBase, 0.0, static_cast<double>(std::max<int64_t>(length, 1)), d->columns,
+                               length) && ok;
+    return ok;
+}
+
+int full_redraw(VELMDRAW d, uint32_t mask)
+{
+    const DrawHooks &hooks = draw_hooks();
+    int ok = VELMDRAW_UpdateDrawAreas(d, 0x80000000u);
+    ok &= prepare_bases(d) ? 1 : 0;
+    VELMCANVAS_SelectTarget(d->canvas, VELMCANVASTARGET_MEMORY);
+    const int last = d->columns - 1;
+    ok &= process_lanes(d, 0, last, false);
+    if (mask & 0x400u) ok &= VELMDRAW_DrawBackground(d);
+    if (mask & 0x8u) ok &= call_hook(hooks.vertScales, d);
+    if (mask & 0x10u) ok &= call_hook(hooks.horzScale, d, 0, last);
+    ok &= draw_lane_backgrounds(d, 0, last, false);
+    ok &= call_hook(hooks.scaleGrids, d, 0, last);
+    ok &= call_hook(hooks.regions, d, 0, last);
+    ok &= draw_lanes(d, 0, last, false);
+    ok &= VELMDRAW_DrawChannelSeparators(d);
+    ok &= VELMDRAW_FullRedrawFromMemory(d);
+    return ok;
+}
+
+// The view-size notification, once per change.
+void notify_size(VELMDRAW d)
+{
+    int32_t width = d->state->drawWidth, height = d->state->drawHeight;
+    BLNOTIFY_SendEvent(d->document->dispatcher, nullptr, 0, 0x20031, &width, &height);
+}
+
+} // namespace
+
+int VELMDRAW_ProcessAudioToDisplay(VELMDRAW d, int first, int last)
+{
+    return d && d->laidOut ? process_lanes(d, first, last, false) : 0;
+}
+
+int VELMDRAW_DrawAudioForm(VELMDRAW d, int first, int last)
+{
+    return d && d->canvas && d->laidOut ? draw_lanes(d, first, last, false) : 0;
+}
+
+int VELMDRAW_DrawCanvas(VELMDRAW d, int first, int last)
+{
+    return d && d->canvas && d->laidOut ? draw_lane_backgrounds(d, first, last, false) : 0;
+}
+
+int VELMDRAW_FullRedrawFromMemory(VELMDRAW d)
+{
+    if (!d || !d->canvas || !d->state) return 0;
+    const int ok = VELMCANVAS_CopyCanvas(d->canvas, VELMCANVASTARGET_MEMORY, VELMCANVASTARGET_OUTPUT);
+    mark_dirty(d, 0, 0, d->state->drawWidth - 1, d->state->drawHeight - 1);
+    return ok;
+}
+
+int VELMDRAW_RestoreMemoryCanvas(VELMDRAW d, int first, int last)
+{
+    if (!d || !d->canvas || !d->laidOut) return 0;
+    first = std::max(first, 0);
+    last = std::min(last, d->columns - 1);
+    if (last < first) return 1;
+    const _VELMRECT &a = d->display;
+    const int x = a.left + first, width = last - first + 1;
+    mark_dirty(d, x, a.top, x + width - 1, a.bottom);
+    return VELMCANVAS_MoveBlock2(d->canvas, VELMCANVASTARGET_MEMORY, x, a.top, width, a.height, VELMCANVASTARGET_OUTPUT,
+                                 x, a.top);
+}
+
+int VELMDRAW_MoveAudioCanvas(VELMDRAW d, int from, int to, int count)
+{
+    if (!d || !d->canvas || !d->laidOut || count <= 0) return 0;
+    // The lanes and custom tracks move as one band; the separators between
+    // them are the same in every column.
+    int32_t bottom = d->lanesArea.bottom;
+    for (int t = 0; t < VELM_MAX_CUSTOM_TRACKS; ++t)
+        if (d->trackShown[static_cast<size_t>(t)]) bottom = std::max(bottom, d->trackAreas[static_cast<size_t>(t)].bottom);
+    const _VELMRECT &a = d->display;
+    int ok = VELMCANVAS_MoveBlock(d->canvas, a.left + from, a.top, count, bottom - a.top + 1, a.left + to, a.top);
+    for (int i = 0; i < d->laneCount; ++i) {
+        Lane &lane = d->lanes[static_cast<size_t>(i)];
+        if (lane.kind == VELMDRAW_LANE_NAVIGATOR) continue;
+        if (lane.wave) ok &= move_wave_data(lane.wave, from, to, count);
+        if (lane.spectral) ok &= move_spectral_data(lane.spectral, from, to, count);
+    }
+    return ok;
+}
+
+int VELMDRAW_UpdateViewWindow(VELMDRAW d)
+{
+    if (!d || !d->canvas || !d->state || !d->laidOut) return 0;
+    VELMTIMEBASE &base = d->mainBase;
+    const VELMSTATE *s = d->state;
+    const int columns = d->columns;
+    const double length = static_cast<double>(s->viewEnd - s->viewBegin);
+    const bool same_grid = base.count == columns && columns > 1 && base.step > 0.0 &&
+                           std::abs(length / (columns - 1) - base.step) < 1e-9 * base.step;
+    const int64_t k = same_grid ? std::llround(std::round(static_cast<double>(s->viewBegin)) / base.step) - base.origin : 0;
+    if (!same_grid || k == 0 || std::llabs(k) >= columns) return full_redraw(d, kEverything);
+
+    VELMCANVAS_SelectTarget(d->canvas, VELMCANVASTARGET_MEMORY);
+    int ok = VELMDRAW_UpdateDrawAreas(d, 0x80000000u);
+    offset_time_base(&base, static_cast<int>(k), static_cast<double>(s->viewBegin), static_cast<double>(s->viewEnd),
+                     AUDIOSIGNAL_NumSamples(d->document->signal));
+    const int shift = static_cast<int>(k);
+    // Besides the new columns, the column beside them and the two at each
+    // end are drawn again: their outline joined other neighbours before.
+    if (shift > 0) {
+        ok &= VELMDRAW_MoveAudioCanvas(d, shift, 0, columns - shift);
+        ok &= draw_columns(d, std::max(columns - shift - 1, 0), columns - 1, true);
+        ok &= draw_columns(d, 0, 1, true);
+    } else {
+        ok &= VELMDRAW_MoveAudioCanvas(d, 0, -shift, columns + shift);
+        ok &= draw_columns(d, 0, std::min(-shift, columns - 1), true);
+        ok &= draw_columns(d, columns - 2, columns - 1, true);
+    }
+    return ok;
+}
+
+int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _VELMRECT *changed)
+{
+    if (!d || !canvas || !state || state->drawWidth <= 0 || state->drawHeight <= 0 ||
+        state->drawWidth > kMaxViewSize || state->drawHeight > kMaxViewSize)
+        return 0;
+    MutexLock(d->lock);
+    VELMSTATE *copy = VELMSTATE_CreateCopy(nullptr, state);
+    if (!copy) {
+        MutexUnlock(d->lock);
+        return 0;
+    }
+    VELMSTATE *old = d->state;
+    uint32_t mask;
+    if (canvas != d->canvas || VELMCANVAS_GetDrawObject(canvas) != d) {
+        mask = kEverything;
+        VELMCANVAS_SetDrawObject(canvas, d);
+        d->canvas = canvas;
+    } else {
+        mask = VELMSTATE_EvalChanges(d->document, copy, old);
+    }
+    mask |= copy->changes;
+    // An edit changes the samples under an unchanged view.
+    const uint64_t change_time = VELMAUDIO_GetChangeTime(d->document);
+    if (change_time != d->drawnChangeTime) mask |= 0x80000000u;
+    d->drawnChangeTime = change_time;
+    const bool size_changed = !old || old->drawWidth != copy->drawWidth || old->drawHeight != copy->drawHeight;
+    if (!old || !d->laidOut) mask |= kEverything;
+
+    int width = 0, height = 0;
+    VELMCANVAS_GetMaxDimension(canvas, &width, &height);
+    width = std::max(width, copy->drawWidth);
+    int ok = reserve_time_base(d->pool, &d->mainBase, width) && reserve_time_base(d->pool, &d->navigatorBase, width);
+
+    d->state = copy;
+    VELMCANVAS_SetAlphaFactor(canvas, 1.0f);
+    VELMCANVAS_UseLowProfile(canvas, d->config.lowGraphicsDetails);
+    VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
+    reset_dirty(d);
+    _VELMRECT overlay{};
+    if (VELMCANVAS_GetOverlayRect(canvas, &overlay) && overlay.width > 0 && overlay.height > 0)
+        mark_dirty(d, overlay.left, overlay.top, overlay.left + overlay.width - 1, overlay.top + overlay.height - 1);
+    VELMCANVAS_RestoreOverlay(canvas);
+
+    const bool empty = AUDIOSIGNAL_NumSamples(d->document->signal) <= 0 && (copy->viewFlags & 0x100000u);
+    const DrawHooks &hooks = draw_hooks();
+    switch (mask & ~0x1000u) {
+    case 0: case 0x2: case 0x80: case 0x100: case 0x180: break;
+    case 0x4: case 0x6: case 0x40: case 0x42: case 0x200: ok &= VELMDRAW_FullRedrawFromMemory(d); break;
+    case 0x4000: ok &= call_hook(hooks.vertScales, d); break;
+    case 0x811: case 0x813:
+        ok &= VELMDRAW_UpdateViewWindow(d);
+        ok &= VELMDRAW_DrawChannelSeparators(d);
+        ok &= VELMDRAW_FullRedrawFromMemory(d);
+        break;
+    default: ok &= full_redraw(d, mask); break;
+    }
+    VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
+    if (empty) {
+        VELMCANVAS_SetAlphaFactor(canvas, 0.5f);
+        VELMCANVAS_SelectColor(canvas, 0);
+        VELMCANVAS_FillRect(canvas, 0, 0, copy->drawWidth, copy->drawHeight, 0);
+        VELMCANVAS_SetAlphaFactor(canvas, 1.0f);
+        mark_dirty(d, 0, 0, copy->drawWidth - 1, copy->drawHeight - 1);
+    } else {
+        ok &= call_hook(hooks.overlays, d, mask);
+    }
+
+    if (changed) {
+        const _VELMRECT &r = d->dirty;
+        *changed = r.right >= r.left && r.bottom >= r.top && (r.right || r.bottom)
+                       ? make_rect(r.left, r.top, r.right - r.left + 1, r.bottom - r.top + 1)
+                       : _VELMRECT{};
+    }
+    reset_dirty(d);
+    if (old) VELMSTATE_Destroy(old);
+    velm::refresh_top_parent(d->state);
+    if (size_changed) notify_size(d);
+    MutexUnlock(d->lock);
+    if (!ok) BLDEBUG_Log(0, "VELMDRAW_UpdateDraw: Update operation failed in one or more steps!");
+    return ok ? 1 : 0;
+}

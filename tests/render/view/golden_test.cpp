@@ -1,0 +1,99 @@
+// The renderer's pictures of real audio, compared with reviewed images.
+#include <gtest/gtest.h>
+
+#include "core/velmconfig.h"
+#include "core/velmnavigation.h"
+#include "testaudio.hpp"
+#include "view_support.hpp"
+
+namespace {
+
+constexpr int kRate = 16000;
+constexpr uint32_t kNoScales = 0xC; // scales come later; their strips stay empty
+
+class Golden : public ::testing::Test {
+protected:
+    VELMAUDIO open(const std::vector<float> &frames, int channels)
+    {
+        VELMAUDIO doc = viewtest::open_audio(dir.file("sound.wav"), frames, kRate, channels);
+        EXPECT_NE(doc, nullptr);
+        docs.push_back(doc);
+        return doc;
+    }
+    VELMAUDIO speech(int channels = 1) { return open(viewtest::speech_like(kRate, channels, 2.0), channels); }
+
+    void expect_golden(VELMAUDIO doc, uint32_t flags, const char *name, int width = 640, int height = 240)
+    {
+        viewtest::Canvas canvas(width, height);
+        ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 2, static_cast<int32_t>(flags)));
+        ASSERT_TRUE(canvas.draw(doc));
+        EXPECT_EQ(viewtest::compare_golden(canvas.output(), name), "");
+    }
+
+    void TearDown() override
+    {
+        for (VELMAUDIO doc : docs) VELMAUDIO_Close(doc);
+    }
+
+    velmtest::TempDir dir;
+    std::vector<VELMAUDIO> docs;
+};
+
+TEST_F(Golden, SpeechAsWaveform)
+{
+    expect_golden(speech(), kNoScales | 0x1, "speech_waveform");
+}
+
+TEST_F(Golden, SpeechAsSpectrogram)
+{
+    expect_golden(speech(), kNoScales | 0x2, "speech_spectrogram");
+}
+
+TEST_F(Golden, SpeechAsBothWithNavigator)
+{
+    expect_golden(speech(), kNoScales | 0x3 | 0x4000, "speech_both_navigator", 640, 320);
+}
+
+TEST_F(Golden, SpeechOnMelScaleWithButtons)
+{
+    VELMAUDIO doc = speech();
+    VELMAUDIO_SetDrawProperty(doc, 4, 1);
+    expect_golden(doc, kNoScales | 0x3 | 0x8000, "speech_mels_buttons", 640, 320);
+    VELMAUDIO_SetDrawProperty(doc, 4, 0);
+}
+
+TEST_F(Golden, SampleLevelShowsTheSplineWithSmallDots)
+{
+    VELMAUDIO doc = speech();
+    // 40 samples over about 600 columns: 15 columns per sample.
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 1000, 1040));
+    expect_golden(doc, kNoScales | 0x1, "speech_samples_small_dots");
+}
+
+TEST_F(Golden, SampleLevelShowsLargeDotsFurtherIn)
+{
+    VELMAUDIO doc = speech();
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 1000, 1030));
+    expect_golden(doc, kNoScales | 0x1, "speech_samples_large_dots");
+}
+
+TEST_F(Golden, SilenceIsAFlatLine)
+{
+    VELMAUDIO doc = open(std::vector<float>(kRate, 0.0f), 1);
+    expect_golden(doc, kNoScales | 0x3, "silence_both");
+}
+
+TEST_F(Golden, SixChannelsWithThreePixelNavigatorLanes)
+{
+    VELMAUDIO doc = speech(6);
+    // 18 pixels of navigator for six channels: lanes of 3 pixels are bars.
+    VELMAUDIO_SetDrawProperty(doc, 7, 18);
+    expect_golden(doc, kNoScales | 0x3 | 0x2000, "six_channels_navigator", 640, 480);
+}
+
+TEST_F(Golden, FramedStereoWaveform)
+{
+    expect_golden(speech(2), 0x1, "stereo_framed");
+}
+
+} // namespace
