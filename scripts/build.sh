@@ -23,5 +23,7 @@ cmake -S "$here" -B "$dir" -G Ninja "${opts[@]}" > "$dir.configure.log" 2>&1 || 
   cat "$dir.configure.log" >&2
   exit 1
 }
+# Let ccache share results between clones of the tree in other folders.
+export CCACHE_BASEDIR="$here" CCACHE_NOHASHDIR=1
 jobs=${VELM_JOBS:-$(nproc)}
 cmake --build "$dir" -j "$jobs" -- "$@"
