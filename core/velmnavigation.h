@@ -31,6 +31,10 @@ VELM_API int VELMAUDIO_ZoomPlayCursor(VELMAUDIO doc);
 VELM_API int VELMAUDIO_SetZoomLimits(VELMAUDIO doc, int64_t a, int64_t b);
 VELM_API int VELMAUDIO_ResetZoomLimits(VELMAUDIO doc);
 VELM_API int VELMAUDIO_SetZoomLimitsToView(VELMAUDIO doc);
+VELM_API int VELMAUDIO_SetZoomLimitsToSelection(VELMAUDIO doc);
+VELM_API int VELMAUDIO_ZoomSelection(VELMAUDIO doc);
+/* Samples per pixel column of the drawn view; -1 for a null document, 0 before the first draw. */
+VELM_API int32_t VELMAUDIO_SamplesPerPixel(VELMAUDIO doc);
 VELM_API int VELMAUDIO_CanZoomIn(VELMAUDIO doc);
 VELM_API int VELMAUDIO_CanZoomOut(VELMAUDIO doc);
 VELM_API int VELMAUDIO_HasZoom(VELMAUDIO doc);
@@ -54,6 +58,7 @@ VELM_API int     VELMAUDIO_SetCursorPosition(VELMAUDIO doc, int64_t position);
 VELM_API int64_t VELMAUDIO_GetCursorPosition(VELMAUDIO doc);
 VELM_API int     VELMAUDIO_CursorPositionChanged(VELMAUDIO doc);
 VELM_API int64_t VELMAUDIO_GetCursorChangedPosition(VELMAUDIO doc);
+VELM_API int64_t VELMAUDIO_GetAnchorChangedPosition(VELMAUDIO doc);
 VELM_API double  VELMAUDIO_GetDisplayTime(VELMAUDIO doc);
 VELM_API int     VELMAUDIO_CursorVisible(VELMAUDIO doc);
 VELM_API int     VELMAUDIO_ShowMainCursor(VELMAUDIO doc);

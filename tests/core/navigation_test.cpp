@@ -3,6 +3,7 @@
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
 #include "core/velmtimeconv.h"
+#include "edit/velmselection.h"
 
 #include <gtest/gtest.h>
 
@@ -295,4 +296,20 @@ TEST(Navigation, WithoutASignalEverythingFails)
     EXPECT_EQ(VELMAUDIO_ViewBegin(nullptr), -1);
     EXPECT_EQ(VELMAUDIO_ZoomVertical(nullptr, 0, 1), 0);
     VELMAUDIO_Close(link);
+}
+
+TEST_F(Doc, ZoomAndLimitToTheSelection)
+{
+    EXPECT_FALSE(VELMAUDIO_ZoomSelection(doc));
+    EXPECT_FALSE(VELMAUDIO_SetZoomLimitsToSelection(doc));
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 300, 700));
+    ASSERT_TRUE(VELMAUDIO_ZoomSelection(doc));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 300);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 700);
+    ASSERT_TRUE(VELMAUDIO_ZoomReset(doc));
+    ASSERT_TRUE(VELMAUDIO_SetZoomLimitsToSelection(doc));
+    EXPECT_EQ(VELMAUDIO_ViewBeginLimit(doc), 300);
+    EXPECT_EQ(VELMAUDIO_ViewEndLimit(doc), 700);
+    EXPECT_EQ(VELMAUDIO_SamplesPerPixel(doc), 0); // nothing drawn yet
+    EXPECT_EQ(VELMAUDIO_SamplesPerPixel(nullptr), -1);
 }
