@@ -39,6 +39,24 @@ VELM_API int  VELMAUDIO_NumCustomTracks(VELMAUDIO doc);
 VELM_API const VELMCUSTOMTRACK *VELMAUDIO_CustomTrackInPosition(VELMAUDIO doc, int position);
 VELM_API const char *VELMAUDIO_CustomTrackIdentifierInPosition(VELMAUDIO doc, int position);
 
+/* The label of the track at a position, from the process-wide settings. */
+VELM_API const char *VELMAUDIO_CustomTrackLabelInPosition(VELMAUDIO doc, int position);
+/* Display properties 0..9 of a track number (see the view state's track entries). */
+VELM_API int32_t VELMAUDIO_GetCustomTrackProperty(VELMAUDIO doc, int track, int property);
+
+/* Per-track switches, kept in the document's settings under
+ * "libvelm.customtrack.<identifier>."; 0 for an unknown identifier. */
+VELM_API int VELMAUDIO_VisibleCustomTrack(VELMAUDIO doc, const char *identifier);
+VELM_API int VELMAUDIO_ShowCustomTrack(VELMAUDIO doc, const char *identifier);
+VELM_API int VELMAUDIO_HideCustomTrack(VELMAUDIO doc, const char *identifier);
+VELM_API const char *VELMAUDIO_CustomTrackLabel(VELMAUDIO doc, const char *identifier);
+VELM_API int VELMAUDIO_SetCustomTrackLabel(VELMAUDIO doc, const char *identifier, const char *label);
+VELM_API int VELMAUDIO_CustomTrackNotifyChanges(VELMAUDIO doc, const char *identifier);
+VELM_API int VELMAUDIO_SetCustomTrackNotifyChanges(VELMAUDIO doc, const char *identifier, int on);
+VELM_API int VELMAUDIO_CustomTrackReadOnly(VELMAUDIO doc, const char *identifier);
+VELM_API int VELMAUDIO_SetCustomTrackReadOnly(VELMAUDIO doc, const char *identifier, int on);
+VELM_API int VELMAUDIO_EditableCustomTrack(VELMAUDIO doc, const char *identifier);
+
 VELM_API uint32_t VELMDEFINES_DecodeCustomTrackOption(const char *text);
 VELM_API int      VELMDEFINES_EncodeCustomTrackOption(uint32_t flags, char *buffer, int size);
 

@@ -70,3 +70,34 @@ TEST(CustomTrackTable, LongIdentifiersAreCut)
     EXPECT_EQ(std::strlen(VELMAUDIO_GetCustomTrackUniqId(doc, id)), 255u);
     VELMAUDIO_Close(doc);
 }
+
+TEST(CustomTrackSwitches, SettingsPerIdentifier)
+{
+    _audio_format format = AUDIO_InitFormat(8000, 1, 16);
+    VELMAUDIO doc = VELMAUDIO_New(&format);
+    ASSERT_EQ(VELMAUDIO_AddCustomTrack(doc, "words"), 1);
+    EXPECT_STREQ(VELMAUDIO_CustomTrackLabel(doc, "words"), "words"); // the identifier by default
+    ASSERT_TRUE(VELMAUDIO_SetCustomTrackLabel(doc, "words", "Words"));
+    EXPECT_STREQ(VELMAUDIO_CustomTrackLabel(doc, "words"), "Words");
+    EXPECT_TRUE(VELMAUDIO_CustomTrackNotifyChanges(doc, "words"));
+    ASSERT_TRUE(VELMAUDIO_SetCustomTrackNotifyChanges(doc, "words", 0x100)); // only the low byte counts
+    EXPECT_FALSE(VELMAUDIO_CustomTrackNotifyChanges(doc, "words"));
+    EXPECT_TRUE(VELMAUDIO_EditableCustomTrack(doc, "words"));
+    ASSERT_TRUE(VELMAUDIO_SetCustomTrackReadOnly(doc, "words", 1));
+    EXPECT_FALSE(VELMAUDIO_EditableCustomTrack(doc, "words"));
+    EXPECT_TRUE(VELMAUDIO_EditableCustomTrack(doc, "nosuchtrack"));
+    EXPECT_TRUE(VELMAUDIO_EditableCustomTrack(doc, nullptr));
+
+    EXPECT_FALSE(VELMAUDIO_VisibleCustomTrack(doc, "words"));
+    ASSERT_TRUE(VELMAUDIO_ShowCustomTrack(doc, "words"));
+    EXPECT_TRUE(VELMAUDIO_VisibleCustomTrack(doc, "words"));
+    ASSERT_TRUE(VELMAUDIO_HideCustomTrack(doc, "words"));
+    EXPECT_FALSE(VELMAUDIO_VisibleCustomTrack(doc, "words"));
+
+    EXPECT_EQ(VELMAUDIO_GetCustomTrackProperty(doc, 1, 1), 24);
+    EXPECT_EQ(VELMAUDIO_GetCustomTrackProperty(doc, 5, 2), 0); // no track holds number 5
+    EXPECT_EQ(VELMAUDIO_GetCustomTrackProperty(doc, 1, 42), 0);
+    EXPECT_STREQ(VELMAUDIO_CustomTrackLabelInPosition(doc, 1), "words"); // from the global settings
+    EXPECT_EQ(VELMAUDIO_CustomTrackLabelInPosition(doc, 7), nullptr);
+    VELMAUDIO_Close(doc);
+}
