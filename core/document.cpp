@@ -10,6 +10,7 @@
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
 #include "edit/velmcustomtrack.h"
+#include "edit/velmregion.h"
 #include "edit/velmundo.h"
 #include "outside/signal/audiosignal.h"
 
@@ -227,6 +228,11 @@ int VELMAUDIO_OpenLink(VELMAUDIO doc)
 
     state->status |= STATUS_BUSY;
     AUDIOSIGNAL *signal = AUDIOSIGNAL_OpenEx(doc->fileName, doc->fileFormat, 3, doc, velm::signal_callback);
+    if (signal && (state->status & STATUS_HAS_REGIONS_FILE) &&
+        AUDIOSIGNAL_ReadRegions(signal, doc->regionsFileName, doc->regionsFileFormat) != 1) {
+        AUDIOSIGNAL_Destroy(signal);
+        signal = nullptr;
+    }
     if (!signal) {
         velm::set_last_error(velm::map_signal_error(AUDIOSIGNAL_GetLastError()));
         state->status &= ~STATUS_BUSY;
@@ -352,7 +358,11 @@ int VELMAUDIO_SaveAs(VELMAUDIO doc, const char *file_name, const char *format)
 int VELMAUDIO_Save(VELMAUDIO doc)
 {
     if (!doc || !doc->signal || !(doc->state->status & STATUS_HAS_FILE)) return 0;
-    return VELMAUDIO_SaveAs(doc, doc->fileName, doc->fileFormat);
+    // A separate regions file is written only after the audio was saved, and a
+    // failed audio save is reported as a failure whatever the regions do.
+    const int saved = VELMAUDIO_SaveAs(doc, doc->fileName, doc->fileFormat);
+    if (saved && (doc->state->status & STATUS_HAS_REGIONS_FILE)) return VELMAUDIO_SaveRegions(doc);
+    return saved;
 }
 
 int VELMAUDIO_SaveCopyAs(VELMAUDIO doc, const char *file_name, const char *format)
