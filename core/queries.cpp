@@ -4,6 +4,7 @@
 #include <cstdio>
 
 #include "core/document_internal.hpp"
+#include "edit/velmundo.h"
 #include "render/view/velmdraw.h"
 
 namespace {
@@ -175,6 +176,7 @@ int64_t VELMAUDIO_SizeInMemory(VELMAUDIO doc)
     int64_t total = BLMEM_SizeInMemory(doc->pool);
     if (doc->signal) total += AUDIOSIGNAL_SizeInMemory(doc->signal);
     if (doc->renderer) total += VELMDRAW_SizeInMemory(doc->renderer);
+    total += VELMUNDO_SizeInMemory(doc);
     return total;
 }
 
@@ -182,7 +184,8 @@ int VELMAUDIO_FreeMemory(VELMAUDIO doc)
 {
     if (!doc) return 0;
     const int64_t before = VELMAUDIO_SizeInMemory(doc);
-    const int ok = doc->signal ? AUDIOSIGNAL_FreeDataMemory(doc->signal) : 1;
+    int ok = doc->signal ? AUDIOSIGNAL_FreeDataMemory(doc->signal) : 1;
+    if (doc->undo && !VELMUNDO_FreeMemory(doc)) ok = 0;
     // The renderer is made again at the next draw.
     if (doc->renderer && !doc->drawing) {
         VELMDRAW_Destroy(doc->renderer);
