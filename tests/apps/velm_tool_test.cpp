@@ -3,7 +3,12 @@
 
 #include <gtest/gtest.h>
 
+#include <QImage>
 #include <cstdio>
+#include <cstdlib>
+#include <fstream>
+#include <set>
+#include <sstream>
 #include <string>
 
 namespace {
@@ -29,6 +34,31 @@ ToolRun run(const std::string &arguments)
 bool has(const ToolRun &r, const std::string &text)
 {
     return r.output.find(text) != std::string::npos;
+}
+
+size_t distinct_colours(const QImage &image)
+{
+    std::set<QRgb> colours;
+    for (int y = 0; y < image.height(); ++y)
+        for (int x = 0; x < image.width(); ++x) colours.insert(image.pixel(x, y));
+    return colours.size();
+}
+
+std::string contents(const std::string &path)
+{
+    std::ifstream in(path, std::ios::binary);
+    std::ostringstream text;
+    text << in.rdbuf();
+    return text.str();
+}
+
+// Sign changes along the first channel of interleaved frames.
+int zero_crossings(const std::vector<float> &frames, int channels)
+{
+    int n = 0;
+    for (size_t i = static_cast<size_t>(channels); i < frames.size(); i += static_cast<size_t>(channels))
+        n += (frames[i - static_cast<size_t>(channels)] < 0) != (frames[i] < 0);
+    return n;
 }
 
 } // namespace
@@ -70,4 +100,158 @@ TEST(VelmTool, BadInputFailsWithAMessage)
     r = run("frobnicate");
     EXPECT_NE(r.status, 0);
     EXPECT_TRUE(has(r, "unknown command")) << r.output;
+}
+
+TEST(VelmTool, RenderDrawsTheDemoSoundWithoutADisplay)
+{
+    velmtest::TempDir dir;
+    const std::string out = dir.file("demo.png");
+    // The tool picks the offscreen platform itself when none is named.
+    const std::string saved = std::getenv("QT_QPA_PLATFORM") ? std::getenv("QT_QPA_PLATFORM") : "";
+    unsetenv("QT_QPA_PLATFORM");
+    const ToolRun r = run("render -o " + out + " --size 320x200");
+    if (!saved.empty()) setenv("QT_QPA_PLATFORM", saved.c_str(), 1);
+    ASSERT_EQ(r.status, 0) << r.output;
+    EXPECT_EQ(r.output, "");
+    const QImage image(QString::fromStdString(out), "PNG");
+    ASSERT_FALSE(image.isNull());
+    EXPECT_EQ(image.width(), 320);
+    EXPECT_EQ(image.height(), 200);
+    // Background, waveform, spectrogram shades and navigator.
+    EXPECT_GT(distinct_colours(image), 16u);
+}
+
+TEST(VelmTool, RenderOptionsChangeThePicture)
+{
+    velmtest::TempDir dir;
+    const std::string sound = dir.file("tone.wav");
+    std::vector<float> frames = velmtest::sine(16000, 1, 32000, 300.0, 0.3);
+    for (size_t i = 16000; i < 20000; ++i) frames[i] *= 2.5f; // a louder stretch in the middle
+    ASSERT_TRUE(velmtest::write_audio(sound, frames, 16000, 1));
+
+    auto render = [&](const std::string &name, const std::string &options) {
+        const std::string out = dir.file(name + ".png");
+        const ToolRun r = run("render " + sound + " -o " + out + " --size 400x240 " + options);
+        EXPECT_EQ(r.status, 0) << options << ": " << r.output;
+        return QImage(QString::fromStdString(out), "PNG");
+    };
+    const QImage waveform = render("waveform", "--lanes waveform");
+    const QImage spectrogram = render("spectrogram", "--lanes spectrogram");
+    const QImage both = render("both", "--lanes both");
+    const QImage middle = render("middle", "--lanes waveform --from 0.9 --to 1.3");
+    const QImage wide = render("wide", "--lanes spectrogram --set libvelm.spectral.preset=wide");
+    for (const QImage *image : {&waveform, &spectrogram, &both, &middle, &wide}) {
+        ASSERT_EQ(image->size(), QSize(400, 240));
+        EXPECT_GT(distinct_colours(*image), 2u);
+    }
+    EXPECT_NE(waveform, spectrogram);
+    EXPECT_NE(waveform, both);
+    EXPECT_NE(spectrogram, both);
+    EXPECT_NE(waveform, middle);
+    EXPECT_NE(spectrogram, wide);
+}
+
+TEST(VelmTool, RenderRefusesBadArgumentsAndKeepsTheOutput)
+{
+    velmtest::TempDir dir;
+    const std::string out = dir.file("keep.png");
+    std::ofstream(out) << "old picture";
+    const char *refused[] = {
+        "--size 10x10", "--size 640", "--size 99999x400", "--lanes waves", "--set colour=red",
+        "--set libvelm.", "--from -1", "--to 2 --bogus",
+    };
+    for (const char *options : refused) {
+        const ToolRun r = run("render -o " + out + " " + options);
+        EXPECT_EQ(WEXITSTATUS(r.status), 2) << options;
+        EXPECT_TRUE(has(r, "cannot use the argument")) << options << ": " << r.output;
+    }
+    ToolRun r = run("render --size 320x200");
+    EXPECT_EQ(WEXITSTATUS(r.status), 2);
+    EXPECT_TRUE(has(r, "an argument is missing")) << r.output;
+    r = run("render -o " + out + " --from 30");
+    EXPECT_EQ(WEXITSTATUS(r.status), 1);
+    EXPECT_TRUE(has(r, "the range holds no samples")) << r.output;
+    r = run("render " + dir.file("missing.wav") + " -o " + out);
+    EXPECT_EQ(WEXITSTATUS(r.status), 1);
+    EXPECT_TRUE(has(r, "cannot open")) << r.output;
+    EXPECT_EQ(contents(out), "old picture");
+
+    r = run("render -o " + dir.file("no/such/folder.png"));
+    EXPECT_EQ(WEXITSTATUS(r.status), 1);
+    EXPECT_TRUE(has(r, "cannot write")) << r.output;
+    r = run("render --help");
+    EXPECT_EQ(r.status, 0);
+    EXPECT_TRUE(has(r, "usage: velm render")) << r.output;
+}
+
+TEST(VelmTool, ConvertResamplesAndMixesDownKeepingThePitch)
+{
+    velmtest::TempDir dir;
+    const std::string in = dir.file("sine.wav");
+    const std::string out = dir.file("mono.wav");
+    ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(44100, 2, 44100, 440.0), 44100, 2));
+    const ToolRun r = run("convert " + in + " " + out + " --rate 16000 --channels 1");
+    ASSERT_EQ(r.status, 0) << r.output;
+    int rate = 0, channels = 0;
+    const std::vector<float> frames = velmtest::read_audio(out, &rate, &channels);
+    EXPECT_EQ(rate, 16000);
+    EXPECT_EQ(channels, 1);
+    EXPECT_NEAR(static_cast<double>(frames.size()), 16000.0, 16.0);
+    // One second of 440 Hz crosses zero 880 times.
+    EXPECT_NEAR(zero_crossings(frames, 1), 880, 10);
+}
+
+TEST(VelmTool, ConvertTakesTheTypeFromTheExtensionOrTheFormat)
+{
+    velmtest::TempDir dir;
+    const std::string in = dir.file("sine.wav");
+    ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(22050, 2, 22050, 1000.0), 22050, 2));
+    ToolRun r = run("convert " + in + " " + dir.file("copy.flac"));
+    ASSERT_EQ(r.status, 0) << r.output;
+    r = run("convert " + in + " " + dir.file("copy.snd") + " --format AIFF --channels 3");
+    ASSERT_EQ(r.status, 0) << r.output;
+
+    SF_INFO flac{}, aiff{};
+    SNDFILE *f = sf_open(dir.file("copy.flac").c_str(), SFM_READ, &flac);
+    ASSERT_NE(f, nullptr);
+    sf_close(f);
+    EXPECT_EQ(flac.format & SF_FORMAT_TYPEMASK, SF_FORMAT_FLAC);
+    EXPECT_EQ(flac.channels, 2);
+    EXPECT_EQ(flac.samplerate, 22050);
+    f = sf_open(dir.file("copy.snd").c_str(), SFM_READ, &aiff);
+    ASSERT_NE(f, nullptr);
+    sf_close(f);
+    EXPECT_EQ(aiff.format & SF_FORMAT_TYPEMASK, SF_FORMAT_AIFF);
+    EXPECT_EQ(aiff.channels, 3);
+    EXPECT_EQ(aiff.frames, 22050);
+}
+
+TEST(VelmTool, ConvertFailuresLeaveTheOutputAlone)
+{
+    velmtest::TempDir dir;
+    const std::string in = dir.file("sine.wav");
+    const std::string out = dir.file("keep.wav");
+    ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(8000, 1, 8000), 8000, 1));
+    std::ofstream(out) << "old sound";
+    ToolRun r = run("convert " + in + " " + out + " --format NOSUCHTYPE");
+    EXPECT_EQ(WEXITSTATUS(r.status), 1);
+    EXPECT_TRUE(has(r, "cannot write")) << r.output;
+    r = run("convert " + in + " " + out + " --rate 2");
+    EXPECT_EQ(WEXITSTATUS(r.status), 1);
+    EXPECT_TRUE(has(r, "cannot convert to 2 Hz")) << r.output;
+    r = run("convert " + dir.file("missing.wav") + " " + out);
+    EXPECT_EQ(WEXITSTATUS(r.status), 1);
+    EXPECT_TRUE(has(r, "cannot open")) << r.output;
+    for (const char *options : {"--rate fast", "--rate 0", "--channels -2", "--format", "extra"}) {
+        r = run("convert " + in + " " + out + " " + options);
+        EXPECT_EQ(WEXITSTATUS(r.status), 2) << options;
+        EXPECT_TRUE(has(r, "cannot use the argument")) << options << ": " << r.output;
+    }
+    r = run("convert " + in);
+    EXPECT_EQ(WEXITSTATUS(r.status), 2);
+    EXPECT_TRUE(has(r, "an argument is missing")) << r.output;
+    EXPECT_EQ(contents(out), "old sound");
+    r = run("convert " + in + " " + dir.file("no/such/folder.wav"));
+    EXPECT_EQ(WEXITSTATUS(r.status), 1);
+    EXPECT_TRUE(has(r, "cannot write")) << r.output;
 }
