@@ -31,15 +31,36 @@ bool parse_count(const char *text, long low, long high, long *out)
     return true;
 }
 
-bool wants_help(int argc, char **argv)
+bool walk_arguments(int argc, char **argv, const std::function<Took(const char *, const char *)> &take,
+                    const char **bad)
 {
-    for (int i = 0; i < argc; ++i)
-        if (std::strcmp(argv[i], "--help") == 0 || std::strcmp(argv[i], "-h") == 0) return true;
-    return false;
+    for (int i = 0; i < argc; ++i) {
+        const char *value = i + 1 < argc ? argv[i + 1] : nullptr;
+        switch (take(argv[i], value)) {
+        case Took::Value:
+            ++i;
+            break;
+        case Took::Alone:
+            break;
+        case Took::BadValue:
+            *bad = value;
+            return false;
+        case Took::Nothing:
+            *bad = argv[i];
+            return false;
+        }
+    }
+    *bad = nullptr;
+    return true;
 }
 
-int refuse(const char *bad, const char *usage)
+int decline(int argc, char **argv, const char *bad, const char *usage)
 {
+    for (int i = 0; i < argc; ++i)
+        if (std::strcmp(argv[i], "--help") == 0 || std::strcmp(argv[i], "-h") == 0) {
+            std::fputs(usage, stdout);
+            return 0;
+        }
     if (bad)
         std::fprintf(stderr, "velm: cannot use the argument '%s'\n", bad);
     else

@@ -23,33 +23,20 @@ struct ConvertArgs {
     long channels = 0;
 };
 
-bool parse(int argc, char **argv, ConvertArgs *args, const char **bad)
+velmtool::Took take(ConvertArgs *args, const char *option, const char *value)
 {
-    for (int i = 0; i < argc; ++i) {
-        *bad = argv[i];
-        const char *option = argv[i];
-        const char *value = i + 1 < argc ? argv[i + 1] : nullptr;
-        bool ok = true;
-        if (std::strcmp(option, "--format") == 0 && value && *value) {
-            args->format = value;
-        } else if (std::strcmp(option, "--rate") == 0 && value) {
-            ok = velmtool::parse_count(value, 1, kMaxRate, &args->rate);
-        } else if (std::strcmp(option, "--channels") == 0 && value) {
-            ok = velmtool::parse_count(value, 1, kMaxChannels, &args->channels);
-        } else if (option[0] != '-' && (!args->in || !args->out)) {
-            (args->in ? args->out : args->in) = option;
-            continue;
-        } else {
-            return false;
-        }
-        if (!ok) {
-            *bad = value;
-            return false;
-        }
-        ++i;
+    using velmtool::Took;
+    using velmtool::value_if;
+    if (option[0] != '-') return velmtool::word_into(args->in ? &args->out : &args->in, option);
+    if (!value) return Took::Nothing;
+    if (std::strcmp(option, "--format") == 0) {
+        args->format = value;
+        return value_if(*value != '\0');
     }
-    *bad = nullptr;
-    return args->in && args->out;
+    if (std::strcmp(option, "--rate") == 0) return value_if(velmtool::parse_count(value, 1, kMaxRate, &args->rate));
+    if (std::strcmp(option, "--channels") == 0)
+        return value_if(velmtool::parse_count(value, 1, kMaxChannels, &args->channels));
+    return Took::Nothing;
 }
 
 // Converts the samples when the rate or the channel count is to change.
@@ -77,13 +64,10 @@ namespace velmtool {
 
 int run_convert(int argc, char **argv)
 {
-    if (wants_help(argc, argv)) {
-        std::fputs(kUsage, stdout);
-        return 0;
-    }
     ConvertArgs args;
     const char *bad = nullptr;
-    if (!parse(argc, argv, &args, &bad)) return refuse(bad, kUsage);
+    const auto option = [&args](const char *text, const char *value) { return take(&args, text, value); };
+    if (!walk_arguments(argc, argv, option, &bad) || !args.out) return decline(argc, argv, bad, kUsage);
     VELMAUDIO doc = open_input(args.in);
     if (!doc) return 1;
     bool ok = change_format(doc, args);

@@ -17,24 +17,15 @@ struct InfoArgs {
     double to = -1.0;
 };
 
-bool parse(int argc, char **argv, InfoArgs *args, const char **bad)
+velmtool::Took take(InfoArgs *args, const char *option, const char *value)
 {
-    for (int i = 0; i < argc; ++i) {
-        *bad = argv[i];
-        const bool has_value = i + 1 < argc;
-        if (std::strcmp(argv[i], "--from") == 0 && has_value) {
-            *bad = argv[++i];
-            if (!velmtool::parse_seconds(argv[i], &args->from)) return false;
-        } else if (std::strcmp(argv[i], "--to") == 0 && has_value) {
-            *bad = argv[++i];
-            if (!velmtool::parse_seconds(argv[i], &args->to)) return false;
-        } else if (argv[i][0] != '-' && !args->file) {
-            args->file = argv[i];
-        } else {
-            return false;
-        }
-    }
-    return true;
+    using velmtool::Took;
+    using velmtool::value_if;
+    if (option[0] != '-') return velmtool::word_into(&args->file, option);
+    if (!value) return Took::Nothing;
+    if (std::strcmp(option, "--from") == 0) return value_if(velmtool::parse_seconds(value, &args->from));
+    if (std::strcmp(option, "--to") == 0) return value_if(velmtool::parse_seconds(value, &args->to));
+    return Took::Nothing;
 }
 
 void print_tag(const char *name, const char *value)
@@ -59,13 +50,10 @@ namespace velmtool {
 int run_info(int argc, char **argv)
 {
     static const char usage[] = "usage: velm info [FILE] [--from SECONDS] [--to SECONDS]\n";
-    if (wants_help(argc, argv)) {
-        std::fputs(usage, stdout);
-        return 0;
-    }
     InfoArgs args;
     const char *bad = nullptr;
-    if (!parse(argc, argv, &args, &bad)) return refuse(bad, usage);
+    const auto option = [&args](const char *text, const char *value) { return take(&args, text, value); };
+    if (!walk_arguments(argc, argv, option, &bad)) return decline(argc, argv, bad, usage);
     VELMAUDIO doc = open_input(args.file);
     if (!doc) return 1;
 

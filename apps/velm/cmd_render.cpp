@@ -74,40 +74,25 @@ bool is_setting(const char *text)
     return std::strncmp(text, prefix, n) == 0 && equals && equals > text + n;
 }
 
-bool parse(int argc, char **argv, RenderArgs *args, const char **bad)
+velmtool::Took take(RenderArgs *args, const char *option, const char *value)
 {
-    for (int i = 0; i < argc; ++i) {
-        *bad = argv[i];
-        const char *option = argv[i];
-        const char *value = i + 1 < argc ? argv[i + 1] : nullptr;
-        bool ok = true;
-        if (std::strcmp(option, "-o") == 0 && value) {
-            args->out = value;
-        } else if (std::strcmp(option, "--size") == 0 && value) {
-            ok = parse_size(value, args);
-        } else if (std::strcmp(option, "--lanes") == 0 && value) {
-            ok = parse_lanes(value, &args->lanes);
-        } else if (std::strcmp(option, "--from") == 0 && value) {
-            ok = velmtool::parse_seconds(value, &args->from);
-        } else if (std::strcmp(option, "--to") == 0 && value) {
-            ok = velmtool::parse_seconds(value, &args->to);
-        } else if (std::strcmp(option, "--set") == 0 && value) {
-            ok = is_setting(value);
-            args->settings.push_back(value);
-        } else if (option[0] != '-' && !args->file) {
-            args->file = option;
-            continue;
-        } else {
-            return false;
-        }
-        if (!ok) {
-            *bad = value;
-            return false;
-        }
-        ++i;
+    using velmtool::Took;
+    using velmtool::value_if;
+    if (option[0] != '-') return velmtool::word_into(&args->file, option);
+    if (!value) return Took::Nothing;
+    if (std::strcmp(option, "-o") == 0) {
+        args->out = value;
+        return Took::Value;
     }
-    *bad = nullptr;
-    return args->out != nullptr;
+    if (std::strcmp(option, "--size") == 0) return value_if(parse_size(value, args));
+    if (std::strcmp(option, "--lanes") == 0) return value_if(parse_lanes(value, &args->lanes));
+    if (std::strcmp(option, "--from") == 0) return value_if(velmtool::parse_seconds(value, &args->from));
+    if (std::strcmp(option, "--to") == 0) return value_if(velmtool::parse_seconds(value, &args->to));
+    if (std::strcmp(option, "--set") == 0) {
+        args->settings.push_back(value);
+        return value_if(is_setting(value));
+    }
+    return Took::Nothing;
 }
 
 struct CloseDocument {
@@ -173,13 +158,10 @@ namespace velmtool {
 
 int run_render(int argc, char **argv)
 {
-    if (wants_help(argc, argv)) {
-        std::fputs(kUsage, stdout);
-        return 0;
-    }
     RenderArgs args;
     const char *bad = nullptr;
-    if (!parse(argc, argv, &args, &bad)) return refuse(bad, kUsage);
+    const auto option = [&args](const char *text, const char *value) { return take(&args, text, value); };
+    if (!walk_arguments(argc, argv, option, &bad) || !args.out) return decline(argc, argv, bad, kUsage);
     for (const char *setting : args.settings) BLSETTINGS_ChangeEx(nullptr, "%s", setting);
 
     // The tool draws without a display unless the caller names a platform.

@@ -36,6 +36,14 @@ bool has(const ToolRun &r, const std::string &text)
     return r.output.find(text) != std::string::npos;
 }
 
+// Runs the tool and expects the exit status and a message holding text.
+void expect_failure(const std::string &arguments, int status, const std::string &text)
+{
+    const ToolRun r = run(arguments);
+    EXPECT_EQ(WEXITSTATUS(r.status), status) << arguments;
+    EXPECT_TRUE(has(r, text)) << arguments << ": " << r.output;
+}
+
 size_t distinct_colours(const QImage &image)
 {
     std::set<QRgb> colours;
@@ -50,6 +58,14 @@ std::string contents(const std::string &path)
     std::ostringstream text;
     text << in.rdbuf();
     return text.str();
+}
+
+// What libsndfile reads in a file's header; all zero when it cannot open it.
+SF_INFO file_info(const std::string &path)
+{
+    SF_INFO info{};
+    if (SNDFILE *f = sf_open(path.c_str(), SFM_READ, &info)) sf_close(f);
+    return info;
 }
 
 // Sign changes along the first channel of interleaved frames.
@@ -91,15 +107,9 @@ TEST(VelmTool, InfoMeasuresAFile)
 TEST(VelmTool, BadInputFailsWithAMessage)
 {
     velmtest::TempDir dir;
-    ToolRun r = run("info " + dir.file("missing.wav"));
-    EXPECT_NE(r.status, 0);
-    EXPECT_TRUE(has(r, "cannot open")) << r.output;
-    r = run("info --from banana");
-    EXPECT_NE(r.status, 0);
-    EXPECT_TRUE(has(r, "usage")) << r.output;
-    r = run("frobnicate");
-    EXPECT_NE(r.status, 0);
-    EXPECT_TRUE(has(r, "unknown command")) << r.output;
+    expect_failure("info " + dir.file("missing.wav"), 1, "cannot open");
+    expect_failure("info --from banana", 2, "cannot use the argument 'banana'");
+    expect_failure("frobnicate", 2, "unknown command");
 }
 
 TEST(VelmTool, RenderDrawsTheDemoSoundWithoutADisplay)
@@ -160,26 +170,14 @@ TEST(VelmTool, RenderRefusesBadArgumentsAndKeepsTheOutput)
         "--size 10x10", "--size 640", "--size 99999x400", "--lanes waves", "--set colour=red",
         "--set libvelm.", "--from -1", "--to 2 --bogus",
     };
-    for (const char *options : refused) {
-        const ToolRun r = run("render -o " + out + " " + options);
-        EXPECT_EQ(WEXITSTATUS(r.status), 2) << options;
-        EXPECT_TRUE(has(r, "cannot use the argument")) << options << ": " << r.output;
-    }
-    ToolRun r = run("render --size 320x200");
-    EXPECT_EQ(WEXITSTATUS(r.status), 2);
-    EXPECT_TRUE(has(r, "an argument is missing")) << r.output;
-    r = run("render -o " + out + " --from 30");
-    EXPECT_EQ(WEXITSTATUS(r.status), 1);
-    EXPECT_TRUE(has(r, "the range holds no samples")) << r.output;
-    r = run("render " + dir.file("missing.wav") + " -o " + out);
-    EXPECT_EQ(WEXITSTATUS(r.status), 1);
-    EXPECT_TRUE(has(r, "cannot open")) << r.output;
+    for (const char *options : refused) expect_failure("render -o " + out + " " + options, 2, "cannot use the argument");
+    expect_failure("render --size 320x200", 2, "an argument is missing");
+    expect_failure("render -o " + out + " --from 30", 1, "the range holds no samples");
+    expect_failure("render " + dir.file("missing.wav") + " -o " + out, 1, "cannot open");
     EXPECT_EQ(contents(out), "old picture");
 
-    r = run("render -o " + dir.file("no/such/folder.png"));
-    EXPECT_EQ(WEXITSTATUS(r.status), 1);
-    EXPECT_TRUE(has(r, "cannot write")) << r.output;
-    r = run("render --help");
+    expect_failure("render -o " + dir.file("no/such/folder.png"), 1, "cannot write");
+    const ToolRun r = run("render --help");
     EXPECT_EQ(r.status, 0);
     EXPECT_TRUE(has(r, "usage: velm render")) << r.output;
 }
@@ -211,16 +209,11 @@ TEST(VelmTool, ConvertTakesTheTypeFromTheExtensionOrTheFormat)
     r = run("convert " + in + " " + dir.file("copy.snd") + " --format AIFF --channels 3");
     ASSERT_EQ(r.status, 0) << r.output;
 
-    SF_INFO flac{}, aiff{};
-    SNDFILE *f = sf_open(dir.file("copy.flac").c_str(), SFM_READ, &flac);
-    ASSERT_NE(f, nullptr);
-    sf_close(f);
+    const SF_INFO flac = file_info(dir.file("copy.flac"));
     EXPECT_EQ(flac.format & SF_FORMAT_TYPEMASK, SF_FORMAT_FLAC);
     EXPECT_EQ(flac.channels, 2);
     EXPECT_EQ(flac.samplerate, 22050);
-    f = sf_open(dir.file("copy.snd").c_str(), SFM_READ, &aiff);
-    ASSERT_NE(f, nullptr);
-    sf_close(f);
+    const SF_INFO aiff = file_info(dir.file("copy.snd"));
     EXPECT_EQ(aiff.format & SF_FORMAT_TYPEMASK, SF_FORMAT_AIFF);
     EXPECT_EQ(aiff.channels, 3);
     EXPECT_EQ(aiff.frames, 22050);
@@ -233,25 +226,12 @@ TEST(VelmTool, ConvertFailuresLeaveTheOutputAlone)
     const std::string out = dir.file("keep.wav");
     ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(8000, 1, 8000), 8000, 1));
     std::ofstream(out) << "old sound";
-    ToolRun r = run("convert " + in + " " + out + " --format NOSUCHTYPE");
-    EXPECT_EQ(WEXITSTATUS(r.status), 1);
-    EXPECT_TRUE(has(r, "cannot write")) << r.output;
-    r = run("convert " + in + " " + out + " --rate 2");
-    EXPECT_EQ(WEXITSTATUS(r.status), 1);
-    EXPECT_TRUE(has(r, "cannot convert to 2 Hz")) << r.output;
-    r = run("convert " + dir.file("missing.wav") + " " + out);
-    EXPECT_EQ(WEXITSTATUS(r.status), 1);
-    EXPECT_TRUE(has(r, "cannot open")) << r.output;
-    for (const char *options : {"--rate fast", "--rate 0", "--channels -2", "--format", "extra"}) {
-        r = run("convert " + in + " " + out + " " + options);
-        EXPECT_EQ(WEXITSTATUS(r.status), 2) << options;
-        EXPECT_TRUE(has(r, "cannot use the argument")) << options << ": " << r.output;
-    }
-    r = run("convert " + in);
-    EXPECT_EQ(WEXITSTATUS(r.status), 2);
-    EXPECT_TRUE(has(r, "an argument is missing")) << r.output;
+    expect_failure("convert " + in + " " + out + " --format NOSUCHTYPE", 1, "cannot write");
+    expect_failure("convert " + in + " " + out + " --rate 2", 1, "cannot convert to 2 Hz");
+    expect_failure("convert " + dir.file("missing.wav") + " " + out, 1, "cannot open");
+    for (const char *options : {"--rate fast", "--rate 0", "--channels -2", "--format", "extra"})
+        expect_failure("convert " + in + " " + out + " " + options, 2, "cannot use the argument");
+    expect_failure("convert " + in, 2, "an argument is missing");
     EXPECT_EQ(contents(out), "old sound");
-    r = run("convert " + in + " " + dir.file("no/such/folder.wav"));
-    EXPECT_EQ(WEXITSTATUS(r.status), 1);
-    EXPECT_TRUE(has(r, "cannot write")) << r.output;
+    expect_failure("convert " + in + " " + dir.file("no/such/folder.wav"), 1, "cannot write");
 }
