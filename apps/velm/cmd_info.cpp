@@ -17,30 +17,15 @@ struct InfoArgs {
     double to = -1.0;
 };
 
-bool parse_seconds(const char *text, double *out)
+velmtool::Took take(InfoArgs *args, const char *option, const char *value)
 {
-    char *end = nullptr;
-    const double value = std::strtod(text, &end);
-    if (!text[0] || *end || !std::isfinite(value) || value < 0) return false;
-    *out = value;
-    return true;
-}
-
-bool parse(int argc, char **argv, InfoArgs *args)
-{
-    for (int i = 0; i < argc; ++i) {
-        const bool has_value = i + 1 < argc;
-        if (std::strcmp(argv[i], "--from") == 0 && has_value) {
-            if (!parse_seconds(argv[++i], &args->from)) return false;
-        } else if (std::strcmp(argv[i], "--to") == 0 && has_value) {
-            if (!parse_seconds(argv[++i], &args->to)) return false;
-        } else if (argv[i][0] != '-' && !args->file) {
-            args->file = argv[i];
-        } else {
-            return false;
-        }
-    }
-    return true;
+    using velmtool::Took;
+    using velmtool::value_if;
+    if (option[0] != '-') return velmtool::word_into(&args->file, option);
+    if (!value) return Took::Nothing;
+    if (std::strcmp(option, "--from") == 0) return value_if(velmtool::parse_seconds(value, &args->from));
+    if (std::strcmp(option, "--to") == 0) return value_if(velmtool::parse_seconds(value, &args->to));
+    return Took::Nothing;
 }
 
 void print_tag(const char *name, const char *value)
@@ -64,11 +49,11 @@ namespace velmtool {
 
 int run_info(int argc, char **argv)
 {
+    static const char usage[] = "usage: velm info [FILE] [--from SECONDS] [--to SECONDS]\n";
     InfoArgs args;
-    if (!parse(argc, argv, &args)) {
-        std::fprintf(stderr, "usage: velm info [FILE] [--from SECONDS] [--to SECONDS]\n");
-        return 2;
-    }
+    const char *bad = nullptr;
+    const auto option = [&args](const char *text, const char *value) { return take(&args, text, value); };
+    if (!walk_arguments(argc, argv, option, &bad)) return decline(argc, argv, bad, usage);
     VELMAUDIO doc = open_input(args.file);
     if (!doc) return 1;
 
@@ -84,9 +69,8 @@ int run_info(int argc, char **argv)
     print_tag("genre", VELMAUDIO_GetGenre(doc));
 
     if (args.from >= 0 || args.to >= 0) {
-        const int64_t begin = VELMAUDIO_TimeToSample(doc, args.from >= 0 ? args.from : 0.0);
-        const int64_t end = args.to >= 0 ? VELMAUDIO_TimeToSample(doc, args.to) : samples;
-        if (begin >= end || !VELMAUDIO_SelectAudio(doc, begin, end)) {
+        int64_t begin = 0, end = 0;
+        if (!sample_range(doc, args.from, args.to, &begin, &end) || !VELMAUDIO_SelectAudio(doc, begin, end)) {
             std::fprintf(stderr, "velm: the range holds no samples\n");
             VELMAUDIO_Close(doc);
             return 1;

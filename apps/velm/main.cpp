@@ -16,6 +16,13 @@ void usage(FILE *out)
                  "  info [FILE] [--from SECONDS] [--to SECONDS]\n"
                  "        format, length, metadata and per-channel peak, RMS and DC offset\n"
                  "        of FILE (the built-in demo sound when no file is given)\n"
+                 "  render [FILE] -o OUT.png [--size WxH] [--lanes waveform|spectrogram|both]\n"
+                 "         [--from SECONDS] [--to SECONDS] [--set libvelm.KEY=VALUE ...]\n"
+                 "        draws the waveform and spectrogram of FILE (or the demo sound)\n"
+                 "        into a PNG picture, 1200x400 and both lanes unless told\n"
+                 "  convert IN OUT [--format TEXT] [--rate HZ] [--channels N]\n"
+                 "        saves IN as OUT, its type from OUT's extension unless --format\n"
+                 "        names one, resampled and remixed when a rate or channel count is given\n"
                  "  version\n"
                  "        the library's version\n");
 }
@@ -30,6 +37,8 @@ int main(int argc, char **argv)
     }
     const char *command = argv[1];
     if (std::strcmp(command, "info") == 0) return velmtool::run_info(argc - 2, argv + 2);
+    if (std::strcmp(command, "render") == 0) return velmtool::run_render(argc - 2, argv + 2);
+    if (std::strcmp(command, "convert") == 0) return velmtool::run_convert(argc - 2, argv + 2);
     if (std::strcmp(command, "version") == 0) {
         std::printf("%s\n", VELMVERSION_String());
         return 0;
