@@ -1,4 +1,5 @@
 // Creating, growing and destroying canvases; the Qt entry points.
+#include "control/velmacckeys.h"
 #include "outside/base/blbase.h"
 #include "render/canvas/canvas_internal.h"
 #include "widgets/resources/velmresources.h"
@@ -77,4 +78,9 @@ int VELMCANVAS_GetDisplayWidth(void)
 int VELMCANVAS_GetDisplayHeight(void)
 {
     return BLUTILS_GetDisplayHeight();
+}
+
+uint32_t VELMCANVAS_TranslateAccKeys(uint32_t keys)
+{
+    return VELMDEFINES_TranslateAccKeys(keys);
 }

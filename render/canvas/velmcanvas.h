@@ -323,6 +323,8 @@ VELM_API int VELMCANVAS_BevelRect(VELMCANVAS canvas, int x, int y, int width, in
 /* The screen size, as the base services know it. */
 VELM_API int VELMCANVAS_GetDisplayWidth(void);
 VELM_API int VELMCANVAS_GetDisplayHeight(void);
+/* The shell's key and button bits as the library's pointer and key flags. */
+VELM_API uint32_t VELMCANVAS_TranslateAccKeys(uint32_t keys);
 
 VELM_EXTERN_C_END
 
