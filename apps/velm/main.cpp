@@ -1,4 +1,4 @@
-// velm: inspect, convert and draw audio files with libvelm.
+// velm: inspect, convert, edit and draw audio files with libvelm.
 #include <cstdio>
 #include <cstring>
 
@@ -23,6 +23,10 @@ void usage(FILE *out)
                  "  convert IN OUT [--format TEXT] [--rate HZ] [--channels N]\n"
                  "        saves IN as OUT, its type from OUT's extension unless --format\n"
                  "        names one, resampled and remixed when a rate or channel count is given\n"
+                 "  edit IN OUT [--format TEXT] OPERATION...\n"
+                 "        runs edits in order (--select FROM:TO, --cut, --paste, --clear, --trim,\n"
+                 "        --silence, --reverse, --effect SCRIPT, --remove-dc, --append FILE, ...)\n"
+                 "        and saves the result as OUT; see velm edit --help\n"
                  "  version\n"
                  "        the library's version\n");
 }
@@ -39,6 +43,7 @@ int main(int argc, char **argv)
     if (std::strcmp(command, "info") == 0) return velmtool::run_info(argc - 2, argv + 2);
     if (std::strcmp(command, "render") == 0) return velmtool::run_render(argc - 2, argv + 2);
     if (std::strcmp(command, "convert") == 0) return velmtool::run_convert(argc - 2, argv + 2);
+    if (std::strcmp(command, "edit") == 0) return velmtool::run_edit(argc - 2, argv + 2);
     if (std::strcmp(command, "version") == 0) {
         std::printf("%s\n", VELMVERSION_String());
         return 0;

@@ -53,6 +53,7 @@ bool sample_range(VELMAUDIO doc, double from, double to, int64_t *begin, int64_t
 int run_info(int argc, char **argv);
 int run_render(int argc, char **argv);
 int run_convert(int argc, char **argv);
+int run_edit(int argc, char **argv);
 
 } // namespace velmtool
 

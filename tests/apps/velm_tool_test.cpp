@@ -3,6 +3,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include <QImage>
 #include <cstdio>
 #include <cstdlib>
@@ -234,4 +236,37 @@ TEST(VelmTool, ConvertFailuresLeaveTheOutputAlone)
     expect_failure("convert " + in, 2, "an argument is missing");
     EXPECT_EQ(contents(out), "old sound");
     expect_failure("convert " + in + " " + dir.file("no/such/folder.wav"), 1, "cannot write");
+}
+
+TEST(VelmTool, EditRunsItsStepsInOrder)
+{
+    velmtest::TempDir dir;
+    const std::string in = dir.file("ramp.wav"), out = dir.file("edited.wav");
+    std::vector<float> ramp(8000);
+    for (size_t i = 0; i < ramp.size(); ++i) ramp[i] = static_cast<float>(i) / 8000.0f;
+    ASSERT_TRUE(velmtest::write_audio(in, ramp, 8000, 1, SF_FORMAT_WAV | SF_FORMAT_FLOAT));
+    // Cut the second quarter, paste it at the start, reverse the last tenth.
+    const ToolRun r = run("edit " + in + " " + out +
+                          " --select 0.25:0.5 --cut --select 0:0.001 --paste --select 0.9:1 --reverse");
+    ASSERT_EQ(WEXITSTATUS(r.status), 0) << r.output;
+    const std::vector<float> edited = velmtest::read_audio(out);
+    std::vector<float> expected(ramp.begin() + 2000, ramp.begin() + 4000);
+    expected.insert(expected.end(), ramp.begin() + 8, ramp.begin() + 2000);
+    expected.insert(expected.end(), ramp.begin() + 4000, ramp.end());
+    std::reverse(expected.begin() + 7200, expected.end()); // 0.9 s to the (now shorter) end
+    ASSERT_EQ(edited.size(), expected.size());
+    for (size_t i = 0; i < edited.size(); ++i) ASSERT_FLOAT_EQ(edited[i], expected[i]) << i;
+}
+
+TEST(VelmTool, AFailedEditStepLeavesTheOutputAlone)
+{
+    velmtest::TempDir dir;
+    const std::string in = dir.file("tone.wav"), out = dir.file("out.wav");
+    ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(8000, 1, 800), 8000, 1));
+    std::ofstream(out) << "precious";
+    expect_failure("edit " + in + " " + out + " --select-all --effect nosuchstage[x=1]", 1, "step 2");
+    EXPECT_EQ(contents(out), "precious");
+    expect_failure("edit " + in + " " + out + " --paste", 1, "was not written");
+    expect_failure("edit " + in + " " + out + " --select 2:1", 2, "--select");
+    EXPECT_EQ(contents(out), "precious");
 }
