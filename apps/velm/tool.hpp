@@ -9,8 +9,8 @@
 
 namespace velmtool {
 
-// A new document holding the built-in demo sound: a few seconds of a
-// stereo chord that swells and fades, with a click track on the right.
+// A new document holding the built-in demo sound, synthesised here: four
+// seconds of stereo with voice-like formant sweeps, two tones and a noise burst.
 VELMAUDIO open_demo_sound();
 
 // Opens FILE, or the demo sound when file is null; prints an error and

@@ -87,7 +87,7 @@ TEST(VelmTool, InfoOnTheDemoSound)
     ASSERT_EQ(r.status, 0) << r.output;
     EXPECT_TRUE(has(r, "44100 Hz")) << r.output;
     EXPECT_TRUE(has(r, "176400 samples (4.000 s)")) << r.output;
-    EXPECT_TRUE(has(r, "Demo chord")) << r.output;
+    EXPECT_TRUE(has(r, "Demo sound")) << r.output;
     EXPECT_TRUE(has(r, "channel 1: peak")) << r.output;
     EXPECT_TRUE(has(r, "channel 2: peak")) << r.output;
 }
