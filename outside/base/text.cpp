@@ -24,9 +24,9 @@ std::optional<std::string> Portable(const char *format)
             out += *++p;
             continue;
         }
-        const size_t spec = std::strspn(p + 1, "-+ #0123456789.*");
-        out.append(p + 1, spec);
-        p += spec;
+        const size_t flags = std::strspn(p + 1, "-+ #0123456789.*");
+        out.append(p + 1, flags);
+        p += flags;
         if (std::strncmp(p + 1, "I64", 3) == 0) {
             out += "ll";
             p += 3;

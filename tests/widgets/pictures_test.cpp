@@ -88,14 +88,14 @@ TEST(PictureData, AreWhatTheGeneratorDraws)
 {
     std::map<std::string, const Expected *> by_name;
     for (const Expected &expected : ExpectedPictures()) by_name[expected.name] = &expected;
-    const auto specs = velm::pictures::AllPictures();
-    ASSERT_EQ(specs.size(), by_name.size());
-    for (const auto &spec : specs) {
-        SCOPED_TRACE(spec.name);
-        const auto found = by_name.find(spec.name);
+    const auto pictures = velm::pictures::AllPictures();
+    ASSERT_EQ(pictures.size(), by_name.size());
+    for (const auto &picture : pictures) {
+        SCOPED_TRACE(picture.name);
+        const auto found = by_name.find(picture.name);
         ASSERT_NE(found, by_name.end());
         // A mismatch means the drawing code changed: run `ninja velm_pictures`.
-        EXPECT_EQ(Decode(*found->second->data), spec.draw().convertToFormat(QImage::Format_ARGB32));
+        EXPECT_EQ(Decode(*found->second->data), picture.draw().convertToFormat(QImage::Format_ARGB32));
     }
 }
 
