@@ -108,6 +108,22 @@ void widen32(const int32_t *raw, float *out, int64_t n) {
     scale(raw + i, out + i, n - i, 1.0f / 2147483648.0f);
 }
 
+// The three bytes go to the top of a 32-bit word, a batch at a time, and
+// widen as 32-bit samples: the low byte is zero, so the result is exactly
+// the 24-bit value over 2^23.
+template <bool BigEndian>
+void widen24(const uint8_t *raw, float *out, int64_t n) {
+    constexpr int64_t kBatch = 1024;
+    int32_t words[kBatch];
+    for (int64_t done = 0; done < n; done += kBatch) {
+        const int64_t count = std::min(kBatch, n - done);
+        for (int64_t i = 0; i < count; ++i, raw += 3)
+            words[i] = static_cast<int32_t>(BigEndian ? uint32_t{raw[0]} << 24 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 8
+                                                      : uint32_t{raw[0]} << 8 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 24);
+        widen32(words, out + done, count);
+    }
+}
+
 }  // namespace
 
 bool DirectPcm::handles(int coding) { return std::endian::native == std::endian::little && bytes_of(coding) > 0; }
@@ -136,21 +152,8 @@ int64_t DirectPcm::read(int64_t first, float *out, int64_t count) const {
             if (big_endian_) return read(uint16_t{}, widen16<true>);
             return read(uint16_t{}, widen16<false>);
         case AUDIO_FORMAT_PCM_24:
-            // The three bytes go to the top of a 32-bit word, then shift down
-            // keeping the sign.
-            if (big_endian_)
-                return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
-                    for (int64_t i = 0; i < n; ++i, raw += 3) {
-                        auto v = static_cast<int32_t>(uint32_t{raw[0]} << 24 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 8);
-                        o[i] = static_cast<float>(v >> 8) * (1.0f / 8388608);
-                    }
-                });
-            return read(uint8_t{}, [](const uint8_t *raw, float *o, int64_t n) {
-                for (int64_t i = 0; i < n; ++i, raw += 3) {
-                    auto v = static_cast<int32_t>(uint32_t{raw[0]} << 8 | uint32_t{raw[1]} << 16 | uint32_t{raw[2]} << 24);
-                    o[i] = static_cast<float>(v >> 8) * (1.0f / 8388608);
-                }
-            });
+            if (big_endian_) return read(uint8_t{}, widen24<true>);
+            return read(uint8_t{}, widen24<false>);
         case AUDIO_FORMAT_PCM_32:
             if (big_endian_)
                 return read(uint32_t{}, [](const uint32_t *raw, float *o, int64_t n) {

@@ -85,6 +85,23 @@ TEST(DirectPcm, EverySixteenBitValueWidensExactlyAtAnyOffset) {
     }
 }
 
+TEST(DirectPcm, TwentyFourBitValuesWidenExactlyInBothByteOrders) {
+    TempDir dir;
+    std::vector<int32_t> values{-(1 << 23), (1 << 23) - 1, -1, 0, 1};
+    for (int32_t v = -(1 << 23); v < (1 << 23); v += 97) values.push_back(v);
+    for (bool big : {false, true}) {
+        std::vector<uint8_t> bytes;
+        for (int32_t v : values)
+            for (int k = 0; k < 3; ++k) bytes.push_back(static_cast<uint8_t>(static_cast<uint32_t>(v) >> (8 * (big ? 2 - k : k))));
+        UniqueFd fd = raw_file(dir.file("values24.raw"), bytes);
+        DirectPcm direct(fd.get(), 0, AUDIO_FORMAT_PCM_24, 1, big);
+        std::vector<float> out(values.size());
+        ASSERT_EQ(direct.read(0, out.data(), static_cast<int64_t>(values.size())), static_cast<int64_t>(values.size()));
+        for (size_t i = 0; i < values.size(); ++i)
+            ASSERT_EQ(out[i], static_cast<float>(values[i]) / 8388608.0f) << values[i] << (big ? " big-endian" : "");
+    }
+}
+
 TEST(DirectPcm, ThirtyTwoBitValuesRoundLikeAScalarConversion) {
     TempDir dir;
     constexpr int32_t lo = std::numeric_limits<int32_t>::min(), hi = std::numeric_limits<int32_t>::max();
