@@ -115,16 +115,28 @@ void scan_frames(const float *frames, int64_t count, int channels, MinMax *out)
     int64_t i = 0;
 #ifdef __SSE2__
     // With 1, 2 or 4 channels every lane of four samples stays on one channel.
+    // Four pairs of running extremes let the loads overlap instead of waiting
+    // on one chain; the sample goes first, so a NaN is passed over (minps and
+    // maxps return their second operand when either is NaN).
     if (4 % channels == 0) {
-        __m128 vlo = _mm_set1_ps(__builtin_inff()), vhi = _mm_set1_ps(-__builtin_inff());
-        for (; (i + 4 / channels) <= count; i += 4 / channels) {
+        const int64_t step = 4 / channels;  // frames per register
+        const __m128 inf = _mm_set1_ps(__builtin_inff()), minus_inf = _mm_set1_ps(-__builtin_inff());
+        __m128 lo[4] = {inf, inf, inf, inf}, hi[4] = {minus_inf, minus_inf, minus_inf, minus_inf};
+        for (; i + 4 * step <= count; i += 4 * step) {
+            for (int k = 0; k < 4; ++k) {
+                const __m128 x = _mm_loadu_ps(frames + (i + k * step) * channels);
+                lo[k] = _mm_min_ps(x, lo[k]);
+                hi[k] = _mm_max_ps(x, hi[k]);
+            }
+        }
+        for (; i + step <= count; i += step) {
             const __m128 x = _mm_loadu_ps(frames + i * channels);
-            vlo = _mm_min_ps(vlo, x);
-            vhi = _mm_max_ps(vhi, x);
+            lo[0] = _mm_min_ps(x, lo[0]);
+            hi[0] = _mm_max_ps(x, hi[0]);
         }
         alignas(16) float l[4], h[4];
-        _mm_store_ps(l, vlo);
-        _mm_store_ps(h, vhi);
+        _mm_store_ps(l, _mm_min_ps(_mm_min_ps(lo[0], lo[1]), _mm_min_ps(lo[2], lo[3])));
+        _mm_store_ps(h, _mm_max_ps(_mm_max_ps(hi[0], hi[1]), _mm_max_ps(hi[2], hi[3])));
         for (int k = 0; k < 4; ++k) out[k % channels].add({l[k], h[k]});
     }
 #endif

@@ -29,16 +29,26 @@ private:
     std::unique_ptr<FileReader> reader_;
 };
 
-// Summaries of every channel of n interleaved frames, in one pass.
-std::vector<std::vector<MinMax>> summarize_frames(const float *frames, int64_t n, int channels)
+// Frames read per step of the scan: a whole number of windows, few enough
+// that the converted floats are still in the cache when they are summarised.
+constexpr int64_t kScanFrames = 32 * kWindowFrames;
+
+// Reads n frames from at and returns every channel's summaries, one step at
+// a time; empty when the read comes up short.
+std::vector<std::vector<MinMax>> summarize_piece(SampleSource &source, int64_t at, int64_t n, std::vector<float> &frames)
 {
+    const int channels = source.channels();
     const size_t windows = size_t((n + kWindowFrames - 1) / kWindowFrames);
     std::vector<std::vector<MinMax>> result(static_cast<size_t>(channels), std::vector<MinMax>(windows));
     MinMax window[AUDIOSIGNAL_MAX_CHANNELS];
-    for (size_t w = 0; w < windows; ++w) {
-        const int64_t begin = int64_t(w) * kWindowFrames, end = std::min(n, begin + kWindowFrames);
-        scan_frames(frames + begin * channels, end - begin, channels, window);
-        for (int c = 0; c < channels; ++c) result[size_t(c)][w] = window[c];
+    for (int64_t step = 0; step < n; step += kScanFrames) {
+        const int64_t count = std::min(kScanFrames, n - step);
+        if (source.read(at + step, frames.data(), count) != count) return {};
+        for (int64_t begin = 0; begin < count; begin += kWindowFrames) {
+            scan_frames(frames.data() + begin * channels, std::min(kWindowFrames, count - begin), channels, window);
+            const size_t w = size_t((step + begin) / kWindowFrames);
+            for (int c = 0; c < channels; ++c) result[size_t(c)][w] = window[c];
+        }
     }
     return result;
 }
@@ -54,14 +64,14 @@ bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<Segm
     std::atomic<int64_t> next{0};
     std::atomic<bool> failed{false};
     auto work = [&] {
-        std::vector<float> frames(size_t(kSourceChunkFrames) * size_t(channels));
+        std::vector<float> frames(size_t(kScanFrames) * size_t(channels));
         for (int64_t k = next++; k < pieces && !failed; k = next++) {
             const int64_t at = k * kSourceChunkFrames, n = std::min(kSourceChunkFrames, source->frames() - at);
-            if (source->read(at, frames.data(), n) != n) {
+            std::vector<std::vector<MinMax>> windows = summarize_piece(*source, at, n, frames);
+            if (windows.empty()) {
                 failed = true;
                 return;
             }
-            std::vector<std::vector<MinMax>> windows = summarize_frames(frames.data(), n, channels);
             for (int c = 0; c < channels; ++c) {
                 chunks[size_t(c)][size_t(k)] = make_source_chunk(source, c, at, n, std::move(windows[size_t(c)]));
             }

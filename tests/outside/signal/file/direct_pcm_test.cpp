@@ -3,6 +3,11 @@
 #include <gtest/gtest.h>
 #include <fcntl.h>
 #include <sndfile.h>
+#include <unistd.h>
+
+#include <bit>
+#include <cstdint>
+#include <limits>
 
 #include "outside/signal/audioformat.h"
 #include "outside/signal/file/direct_pcm_internal.hpp"
@@ -49,6 +54,67 @@ TEST(DirectPcm, MatchesLibsndfileInBothByteOrders) {
             ASSERT_EQ(direct.read(1234, ours.data() + 3 * 1234, 9999), 5000 - 1234);
             EXPECT_EQ(ours, theirs) << c.sf << " " << order;
         }
+}
+
+// Stores words as they are in memory; the descriptor of the raw file.
+template <typename Word>
+UniqueFd raw_file(const std::string &path, const std::vector<Word> &words) {
+    UniqueFd fd(open(path.c_str(), O_RDWR | O_CREAT | O_TRUNC, 0600));
+    const auto bytes = static_cast<ssize_t>(words.size() * sizeof(Word));
+    EXPECT_EQ(write(fd.get(), words.data(), static_cast<size_t>(bytes)), bytes);
+    return fd;
+}
+
+TEST(DirectPcm, EverySixteenBitValueWidensExactlyAtAnyOffset) {
+    TempDir dir;
+    std::vector<uint16_t> words;
+    for (int v = -32768; v <= 32767; ++v) words.push_back(static_cast<uint16_t>(v));
+    for (bool swapped : {false, true}) {
+        std::vector<uint16_t> stored = words;
+        if (swapped)
+            for (uint16_t &w : stored) w = __builtin_bswap16(w);
+        UniqueFd fd = raw_file(dir.file("all16.raw"), stored);
+        DirectPcm direct(fd.get(), 0, AUDIO_FORMAT_PCM_16, 1, swapped);
+        // Starting one sample in leaves every read unaligned with a short tail.
+        std::vector<float> out(words.size() - 1);
+        ASSERT_EQ(direct.read(1, out.data(), 70000), static_cast<int64_t>(out.size()));
+        for (size_t i = 0; i < out.size(); ++i) {
+            const int v = static_cast<int16_t>(words[i + 1]);
+            ASSERT_EQ(out[i], static_cast<float>(v) / 32768.0f) << v << (swapped ? " swapped" : "");
+        }
+    }
+}
+
+TEST(DirectPcm, TwentyFourBitValuesWidenExactlyInBothByteOrders) {
+    TempDir dir;
+    std::vector<int32_t> values{-(1 << 23), (1 << 23) - 1, -1, 0, 1};
+    for (int32_t v = -(1 << 23); v < (1 << 23); v += 97) values.push_back(v);
+    for (bool big : {false, true}) {
+        std::vector<uint8_t> bytes;
+        for (int32_t v : values)
+            for (int k = 0; k < 3; ++k) bytes.push_back(static_cast<uint8_t>(static_cast<uint32_t>(v) >> (8 * (big ? 2 - k : k))));
+        UniqueFd fd = raw_file(dir.file("values24.raw"), bytes);
+        DirectPcm direct(fd.get(), 0, AUDIO_FORMAT_PCM_24, 1, big);
+        std::vector<float> out(values.size());
+        ASSERT_EQ(direct.read(0, out.data(), static_cast<int64_t>(values.size())), static_cast<int64_t>(values.size()));
+        for (size_t i = 0; i < values.size(); ++i)
+            ASSERT_EQ(out[i], static_cast<float>(values[i]) / 8388608.0f) << values[i] << (big ? " big-endian" : "");
+    }
+}
+
+TEST(DirectPcm, ThirtyTwoBitValuesRoundLikeAScalarConversion) {
+    TempDir dir;
+    constexpr int32_t lo = std::numeric_limits<int32_t>::min(), hi = std::numeric_limits<int32_t>::max();
+    // Extremes and values between two floats, where rounding shows.
+    std::vector<int32_t> values{lo, lo + 1, hi, hi - 1, 0, 1, -1, (1 << 24) + 1, -(1 << 24) - 1, 0x7FFFFFC0, 0x40000041};
+    for (int i = 0; i < 1000; ++i) values.push_back(static_cast<int32_t>(static_cast<uint32_t>(i) * 2654435761u));
+    UniqueFd fd = raw_file(dir.file("edges32.raw"), values);
+    DirectPcm direct(fd.get(), 0, AUDIO_FORMAT_PCM_32, 1, false);
+    std::vector<float> out(values.size());
+    ASSERT_EQ(direct.read(0, out.data(), static_cast<int64_t>(values.size())), static_cast<int64_t>(values.size()));
+    for (size_t i = 0; i < values.size(); ++i)
+        ASSERT_EQ(std::bit_cast<uint32_t>(out[i]), std::bit_cast<uint32_t>(static_cast<float>(values[i]) / 2147483648.0f))
+            << values[i];
 }
 
 }  // namespace

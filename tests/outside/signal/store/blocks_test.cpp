@@ -89,6 +89,33 @@ TEST(SignalStoreBlocks, MemoryChunksAndSlicesGiveExactExtremes)
     expect_matches(*spliced, reference, 3);
 }
 
+TEST(SignalStoreBlocks, NanSamplesDoNotHideTheExtremesBeforeThem)
+{
+    std::vector<float> samples = random_samples(3000, 6);
+    for (float &x : samples) x *= 0.5f;
+    // Each extreme is followed by a NaN four samples on (the same vector lane)
+    // and one at the very end of its window.
+    samples[0] = -0.9f;
+    samples[4] = __builtin_nanf("");
+    samples[300] = 0.95f;
+    samples[304] = __builtin_nanf("");
+    samples[511] = __builtin_nanf("");
+    SegmentsBuilder builder;
+    builder.append_samples(samples.data(), int64_t(samples.size()));
+    SegmentsPtr sequence = builder.build();
+    std::vector<float> window(static_cast<size_t>(kWindowFrames));
+    WindowCache cache{0, -1, 0, window.data()};
+    for (const auto &[first, count] : {std::pair<int64_t, int64_t>{0, 3000}, {0, 256}, {256, 256}, {1, 2000}}) {
+        MinMax expected = MinMax::empty();
+        for (int64_t i = first; i < first + count; ++i) expected.add({samples[size_t(i)], samples[size_t(i)]});
+        const MinMax got = sequence->minmax(first, count, cache);
+        EXPECT_EQ(got.min, expected.min) << first << "+" << count;
+        EXPECT_EQ(got.max, expected.max) << first << "+" << count;
+    }
+    EXPECT_EQ(sequence->minmax(0, 3000, cache).min, -0.9f);
+    EXPECT_EQ(sequence->minmax(0, 3000, cache).max, 0.95f);
+}
+
 TEST(SignalStoreBlocks, NeighbouringSlicesOfOneChunkJoin)
 {
     const std::vector<float> samples = random_samples(1000, 4);

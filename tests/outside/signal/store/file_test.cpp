@@ -98,6 +98,31 @@ TEST(SignalStoreFile, EveryChannelCountGetsExactSummaries)
     }
 }
 
+TEST(SignalStoreFile, SummariesStayExactAcrossTheScansPieces)
+{
+    // A little over two of the scan's pieces, so that threads share it and
+    // the last piece ends inside a window.
+    const int64_t frames = 2 * (int64_t(1) << 20) + 1000;
+    const std::string path = temp_path("long.wav");
+    Channels samples = random_channels(1, frames, 47);
+    samples[0][size_t(frames) - 1] = 1.0f;  // the peak in the last, partial window
+    samples[0][(size_t(1) << 20) - 1] = -1.0f;  // the trough just before the first piece ends
+    const Channels expected = write_file(path, samples, SF_FORMAT_WAV | SF_FORMAT_PCM_16);
+    AUDIOSIGNAL *signal = AUDIOSIGNAL_OpenEx(path.c_str(), "AUTO", 0, nullptr, nullptr);
+    ASSERT_NE(signal, nullptr);
+    EXPECT_EQ(read_all(signal), expected);
+    const auto &channel = expected[0];
+    for (const auto &[at, n] : {std::pair<int64_t, int64_t>{0, frames}, {1000000, 100000}, {(1 << 20) - 1, 2},
+                               {2 * (1 << 20) - 300, 1300}, {frames - 1, 1}}) {
+        float lo, hi;
+        ASSERT_EQ(AUDIOSIGNAL_GetChannelMinMax(signal, 0, at, n, &lo, &hi), 1);
+        EXPECT_EQ(lo, *std::min_element(channel.begin() + at, channel.begin() + at + n)) << at;
+        EXPECT_EQ(hi, *std::max_element(channel.begin() + at, channel.begin() + at + n)) << at;
+    }
+    AUDIOSIGNAL_Destroy(signal);
+    unlink(path.c_str());
+}
+
 TEST(SignalStoreFile, CompressedFilesAreDecodedOnceOutOfMemory)
 {
     const std::string path = temp_path("coded.flac");
