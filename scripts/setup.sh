@@ -11,7 +11,7 @@ packages=(
   libsqlite3-dev liblua5.1-0-dev lua5.1
   libsndfile1-dev libfftw3-dev libsoxr-dev libasound2-dev
   libgtest-dev libgmock-dev libbenchmark-dev
-  sox
+  sox time
 )
 
 missing=()
