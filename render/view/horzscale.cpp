@@ -106,7 +106,7 @@ void minor_ticks(VELMDRAW d, double x, double spacing, int first, int last)
     for (int i = 1; i <= 4; ++i) {
         const int column = static_cast<int>(std::floor(x + i * spacing / 5.0 + 0.5));
         if (column > first && column < last)
-            VELMCANVAS_DrawLine(d->canvas, strip.left + column, strip.top + 1, strip.left + column, strip.top + 2);
+            draw_vline(d->canvas, strip.left + column, strip.top + 1, strip.top + 2);
     }
 }
 
@@ -212,7 +212,7 @@ int VELMDRAW_DrawHorzScale(VELMDRAW d, int first, int last)
     const VELMDRAWCONFIG &c = d->config;
     const int left = strip.left + first, width = last - first + 1;
     VELMCANVAS_SelectColor(d->canvas, c.scaleTickPen);
-    VELMCANVAS_DrawLine(d->canvas, left, strip.top, left + width - 1, strip.top);
+    draw_hline(d->canvas, left, left + width - 1, strip.top);
     if (!(f & 0x1000000u)) {
         VELMCANVAS_SelectColor(d->canvas, c.scaleBgBrush);
         VELMCANVAS_FillRect(d->canvas, left, strip.top + 1, width, strip.height - 1, 0);
@@ -230,9 +230,9 @@ int VELMDRAW_DrawHorzScale(VELMDRAW d, int first, int last)
         const HorzTick &tick = h.ticks[static_cast<size_t>(i)];
         if (tick.x > last) break;
         const int x = strip.left + tick.x;
-        VELMCANVAS_DrawLine(d->canvas, x, strip.top, x, strip.top + 2);
+        draw_vline(d->canvas, x, strip.top, strip.top + 2);
         if (tick.major) {
-            VELMCANVAS_DrawLine(d->canvas, x, strip.top + 2, x, strip.top + 8);
+            draw_vline(d->canvas, x, strip.top + 2, strip.top + 8);
             char text[64] = "";
             if (tick_label(d, tick.sample, text, sizeof text))
                 VELMCANVAS_TextOut(d->canvas, x + 4, strip.top + 5, text);
@@ -257,13 +257,13 @@ int VELMDRAW_DrawHorzScaleGrid(VELMDRAW d, int first, int last)
         for (int l = 0; l < d->laneCount; ++l) {
             const Lane &lane = d->lanes[static_cast<size_t>(l)];
             if (!lane.shown || !lane.drawsGrid || lane.area.height <= 0) continue;
-            VELMCANVAS_DrawLine(d->canvas, lane.area.left + column, lane.area.top, lane.area.left + column, lane.area.bottom);
+            draw_vline(d->canvas, lane.area.left + column, lane.area.top, lane.area.bottom);
         }
         if (f & 0x800u) continue;
         for (int t = 0; t < VELM_MAX_CUSTOM_TRACKS; ++t) {
             if (!grid_track(d, t)) continue;
             const _VELMRECT &a = d->trackAreas[static_cast<size_t>(t)];
-            VELMCANVAS_DrawLine(d->canvas, a.left + column, a.top, a.left + column, a.bottom);
+            draw_vline(d->canvas, a.left + column, a.top, a.bottom);
         }
     }
     return 1;

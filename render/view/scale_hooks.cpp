@@ -16,11 +16,13 @@ int prepare_and_draw_horz_scale(VELMDRAW drawer, int, int)
 
 int draw_scale_grids(VELMDRAW drawer, int first, int last)
 {
-    return VELMDRAW_DrawHorzScaleGrid(drawer, first, last);
+    const int ok = VELMDRAW_DrawHorzScaleGrid(drawer, first, last);
+    return VELMDRAW_DrawVertScaleGrid(drawer, first, last) && ok;
 }
 
 const bool registered = [] {
     DrawHooks &hooks = draw_hooks();
+    hooks.vertScales = VELMDRAW_DrawVertScale;
     hooks.horzScale = prepare_and_draw_horz_scale;
     hooks.scaleGrids = draw_scale_grids;
     return true;

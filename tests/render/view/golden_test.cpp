@@ -141,3 +141,49 @@ TEST_F(HorzScaleGolden, NoGridWithFlag)
 }
 
 } // namespace
+
+namespace {
+
+// The value scales beside the lanes in each kind.
+class VertScaleGolden : public Golden {
+protected:
+    void expect_kind(int property, int kind, uint32_t flags, const char *name, int height = 240)
+    {
+        VELMAUDIO doc = speech(2);
+        ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, property, kind));
+        expect_golden(doc, flags, name, 640, height);
+        VELMAUDIO_SetDrawProperty(doc, property, 0);
+    }
+};
+
+TEST_F(VertScaleGolden, SampleValues)
+{
+    expect_kind(3, 0, 0x1, "vert_sample");
+}
+
+TEST_F(VertScaleGolden, Decibels)
+{
+    expect_kind(3, 1, 0x1, "vert_decibel");
+}
+
+TEST_F(VertScaleGolden, Percent)
+{
+    expect_kind(3, 2, 0x1, "vert_percent", 400);
+}
+
+TEST_F(VertScaleGolden, Normalised)
+{
+    expect_kind(3, 3, 0x1, "vert_normalized");
+}
+
+TEST_F(VertScaleGolden, HertzBesideSpectrograms)
+{
+    expect_kind(4, 0, 0x3, "vert_hertz", 400);
+}
+
+TEST_F(VertScaleGolden, MelsBesideSpectrograms)
+{
+    expect_kind(4, 1, 0x3, "vert_mels", 400);
+}
+
+} // namespace

@@ -1,9 +1,11 @@
-// The horizontal scale: steps chosen at several zooms and rates, tick layout,
-// labels and the column of a sample.
+// The scales: horizontal steps chosen at several zooms and rates, tick
+// layout, labels and the column of a sample; vertical steps and rows of the
+// value and spectral scales.
 #include <gtest/gtest.h>
 
 #include <QPainter>
-#include <cstring>
+#include <cstdio>
+#include <memory>
 
 #include "core/document_internal.hpp"
 #include "core/velmconfig.h"
@@ -42,7 +44,7 @@ protected:
         VELMDRAWCONFIG config{};
         VELMCONFIG_InitDrawConfig(&config);
         _VELMCANVASFONT font{};
-        std::strncpy(font.name, config.scaleFont.familyName, sizeof font.name - 1);
+        std::snprintf(font.name, sizeof font.name, "%s", config.scaleFont.familyName);
         font.size = config.scaleFont.size;
         font.style = static_cast<uint32_t>(config.scaleFont.properties);
         char text[64] = "";
@@ -184,6 +186,98 @@ TEST_F(HorzScale, NullDrawerAnswersFailure)
     EXPECT_EQ(VELMDRAW_HorzScaleGetDisplayXPos(nullptr, 0), -1);
     EXPECT_EQ(VELMDRAW_DrawHorzScale(nullptr, 0, 10), 0);
     EXPECT_EQ(VELMDRAW_DrawHorzScaleGrid(nullptr, 0, 10), 0);
+}
+
+// A mono 16-bit sound at 16000 Hz drawn with waveform and spectrogram
+// lanes 300 pixels high each, showing amplitudes -1 .. +1.
+class VertScale : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        doc = viewtest::open_audio(dir.file("sound.wav"), viewtest::speech_like(16000, 1, 1.0), 16000, 1);
+        ASSERT_NE(doc, nullptr);
+        ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 2, 0x3));
+        // The layout takes a fixed amount around the lanes, and the two
+        // lanes share the rest: measure it and grow by twice what is missing.
+        int height = 700;
+        for (int attempt = 0; attempt < 3; ++attempt) {
+            canvas = std::make_unique<viewtest::Canvas>(kWidth, height);
+            ASSERT_TRUE(canvas->draw(doc));
+            _VELMRECT lane{};
+            ASSERT_TRUE(VELMDRAW_GetDrawAreaRect(doc->renderer, 0, &lane));
+            height += 2 * (300 - lane.height);
+        }
+        ASSERT_TRUE(VELMDRAW_GetDrawAreaRect(doc->renderer, 0, &wave));
+        ASSERT_TRUE(VELMDRAW_GetDrawAreaRect(doc->renderer, 1, &spectral));
+        ASSERT_EQ(wave.height, 300);
+        ASSERT_EQ(spectral.height, 300);
+        d = doc->renderer;
+    }
+    void TearDown() override
+    {
+        if (doc) {
+            VELMAUDIO_SetDrawProperty(doc, 4, VELMDRAW_SPEC_HERTZ);
+            VELMAUDIO_Close(doc);
+        }
+    }
+
+    velmtest::TempDir dir;
+    std::unique_ptr<viewtest::Canvas> canvas;
+    VELMAUDIO doc = nullptr;
+    VELMDRAW d = nullptr;
+    _VELMRECT wave{}, spectral{};
+};
+
+TEST_F(VertScale, StepsPutGridLinesAbout30PixelsApart)
+{
+    // 1.5 pixels per percent: 20 % spans exactly 30 pixels.
+    EXPECT_DOUBLE_EQ(VELMDRAW_CalculateVertScaleStep(d, 0, VELMDRAW_VERT_PERCENT, 16), 20.0);
+    // 150 pixels per unit amplitude.
+    EXPECT_DOUBLE_EQ(VELMDRAW_CalculateVertScaleStep(d, 0, VELMDRAW_VERT_NORMALIZED, 16), 0.2);
+    EXPECT_DOUBLE_EQ(VELMDRAW_CalculateVertScaleStep(d, 0, VELMDRAW_VERT_DECIBEL, 16), 0.2);
+    // 7500 of 32768 sample values span 34.3 pixels, 5000 span 22.9.
+    EXPECT_DOUBLE_EQ(VELMDRAW_CalculateVertScaleStep(d, 0, VELMDRAW_VERT_SAMPLE, 16), 7500.0);
+    // 24-bit values are 256 times finer: the decade grows.
+    EXPECT_DOUBLE_EQ(VELMDRAW_CalculateVertScaleStep(d, 0, VELMDRAW_VERT_SAMPLE, 24), 2000000.0);
+    EXPECT_EQ(VELMDRAW_CalculateVertScaleStep(d, 0, 7, 16), 0.0);
+}
+
+TEST_F(VertScale, SpectralStepsInHertzAndMels)
+{
+    // 8000 Hz over 300 pixels: 1000 Hz span 37.5 pixels, 500 Hz 18.75.
+    EXPECT_DOUBLE_EQ(VELMDRAW_CalculateSpecScaleStep(d, 1, VELMDRAW_SPEC_HERTZ), 1000.0);
+    // A waveform lane has no spectral step, nor a spectrogram a value step.
+    EXPECT_EQ(VELMDRAW_CalculateSpecScaleStep(d, 0, VELMDRAW_SPEC_HERTZ), 0.0);
+    EXPECT_EQ(VELMDRAW_CalculateVertScaleStep(d, 1, VELMDRAW_VERT_PERCENT, 16), 0.0);
+
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 4, VELMDRAW_SPEC_MELS));
+    ASSERT_TRUE(canvas->draw(doc));
+    // About 2840 Mels at 8000 Hz: 250 Mels span 26.4 pixels, 500 span 52.8.
+    EXPECT_DOUBLE_EQ(VELMDRAW_CalculateSpecScaleStep(d, 1, VELMDRAW_SPEC_MELS), 250.0);
+    EXPECT_EQ(VELMDRAW_ConvertSpecScaleKindRealYtoDisplayY(d, 1, VELMDRAW_SPEC_HERTZ, 8000.0), 0);
+    EXPECT_EQ(VELMDRAW_ConvertSpecScaleKindRealYtoDisplayY(d, 1, VELMDRAW_SPEC_HERTZ, 0.0), 300);
+}
+
+TEST_F(VertScale, RowsOfValuesInEachKind)
+{
+    EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(d, 0, VELMDRAW_VERT_PERCENT, 100.0), 0);
+    EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(d, 0, VELMDRAW_VERT_PERCENT, 0.0), 150);
+    EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(d, 0, VELMDRAW_VERT_NORMALIZED, -1.0), 300);
+    EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(d, 0, VELMDRAW_VERT_SAMPLE, 16384.0), 75);
+    // 4000 Hz is half way up the hertz scale.
+    EXPECT_EQ(VELMDRAW_ConvertSpecScaleKindRealYtoDisplayY(d, 1, VELMDRAW_SPEC_HERTZ, 4000.0), 150);
+    EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(d, 0, 9, 1.0), -1);
+    EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(d, 1, VELMDRAW_VERT_PERCENT, 1.0), -1);
+}
+
+TEST(VertScaleArguments, NullDrawerAndBadLanesAnswerFailure)
+{
+    EXPECT_EQ(VELMDRAW_DrawVertScale(nullptr), 0);
+    EXPECT_EQ(VELMDRAW_DrawVertScaleGrid(nullptr, 0, 10), 0);
+    EXPECT_EQ(VELMDRAW_CalculateVertScaleStep(nullptr, 0, 0, 16), 0.0);
+    EXPECT_EQ(VELMDRAW_CalculateSpecScaleStep(nullptr, 0, 0), 0.0);
+    EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(nullptr, 0, 0, 0.0), -1);
+    EXPECT_EQ(VELMDRAW_ConvertSpecScaleKindRealYtoDisplayY(nullptr, 0, 0, 0.0), -1);
 }
 
 } // namespace
