@@ -270,6 +270,26 @@ TEST_F(VertScale, RowsOfValuesInEachKind)
     EXPECT_EQ(VELMDRAW_ConvertVertScaleKindRealYtoDisplayY(d, 1, VELMDRAW_VERT_PERCENT, 1.0), -1);
 }
 
+TEST_F(VertScale, ChangingKindsRedrawsLikeAFreshView)
+{
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 3, VELMDRAW_VERT_PERCENT));
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 4, VELMDRAW_SPEC_MELS));
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 5, VELMDRAW_HORZ_SAMPLE));
+    ASSERT_TRUE(canvas->draw(doc));
+    const QImage changed = canvas->output();
+    VELMAUDIO fresh = VELMAUDIO_Open(dir.file("sound.wav").c_str(), "AUTO");
+    ASSERT_NE(fresh, nullptr);
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(fresh, 2, 0x3));
+    int width = 0, height = 0;
+    VELMCANVAS_GetDimension(canvas->get(), &width, &height);
+    viewtest::Canvas other(width, height);
+    ASSERT_TRUE(other.draw(fresh));
+    EXPECT_EQ(viewtest::count_differences(changed, other.output()), 0);
+    VELMAUDIO_Close(fresh);
+    VELMAUDIO_SetDrawProperty(doc, 3, VELMDRAW_VERT_SAMPLE);
+    VELMAUDIO_SetDrawProperty(doc, 5, VELMDRAW_HORZ_TIME);
+}
+
 TEST(VertScaleArguments, NullDrawerAndBadLanesAnswerFailure)
 {
     EXPECT_EQ(VELMDRAW_DrawVertScale(nullptr), 0);
