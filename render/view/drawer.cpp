@@ -22,6 +22,16 @@ _VELMRECT make_rect(int32_t left, int32_t top, int32_t width, int32_t height)
     return _VELMRECT{left, top, width, height, left + width - 1, top + height - 1};
 }
 
+void draw_hline(VELMCANVAS canvas, int x1, int x2, int y)
+{
+    if (x2 >= x1) VELMCANVAS_FillRect(canvas, x1, y, x2 - x1 + 1, 1, 0);
+}
+
+void draw_vline(VELMCANVAS canvas, int x, int y1, int y2)
+{
+    if (y2 >= y1) VELMCANVAS_FillRect(canvas, x, y1, 1, y2 - y1 + 1, 0);
+}
+
 _VELMCANVASFONT canvas_font(const VELMCONFIGFONT &config)
 {
     _VELMCANVASFONT font{};

@@ -129,8 +129,37 @@ struct DrawHooks {
 
 DrawHooks &draw_hooks();
 
+// Ticks of the horizontal scale: positions origin + k * step that fall on
+// the display (or a little left of it, for labels reaching in).
+struct HorzTick {
+    int32_t x = 0;        // column
+    int64_t sample = 0;
+    uint8_t major = 0;    // labelled
+};
+
+constexpr int kMaxHorzTicks = 512;
+
+struct HorzScale {
+    int64_t step = 0;
+    int64_t count = 0;
+    int64_t origin = 0;
+    int64_t spacing = 0;  // columns between the first two ticks
+    std::array<HorzTick, kMaxHorzTicks + 1> ticks{}; // count entries, then a sentinel
+};
+
+// Samples between ticks of a horizontal scale kind so that ticks stand at
+// least min_spacing columns apart; rate is the sample rate, or the frame
+// length in samples for the frame kinds.
+int64_t horz_scale_step(int kind, double rate, double columns, double view_length, double min_spacing);
+
+// Widens the dirty rectangle by the given output pixels.
+void mark_dirty(VELMDRAW drawer, int32_t left, int32_t top, int32_t right, int32_t bottom);
+
 // Small rectangle helpers.
 _VELMRECT make_rect(int32_t left, int32_t top, int32_t width, int32_t height);
+// Axis-aligned lines of the selected colour covering both end points.
+void draw_hline(VELMCANVAS canvas, int x1, int x2, int y);
+void draw_vline(VELMCANVAS canvas, int x, int y1, int y2);
 // The canvas font record of a configured font.
 _VELMCANVASFONT canvas_font(const VELMCONFIGFONT &config);
 
@@ -198,6 +227,7 @@ struct _VELMDRAW {
     BLMUTEX      lock = nullptr;
     uint8_t      laidOut = 0;
     uint64_t     drawnChangeTime = 0;   // the document's change stamp of the last frame
+    velm::view::HorzScale horzTicks;
 };
 
 #endif

@@ -10,6 +10,14 @@
 
 using namespace velm::view;
 
+void velm::view::mark_dirty(VELMDRAW d, int32_t left, int32_t top, int32_t right, int32_t bottom)
+{
+    d->dirty.left = std::min(d->dirty.left, left);
+    d->dirty.top = std::min(d->dirty.top, top);
+    d->dirty.right = std::max(d->dirty.right, right);
+    d->dirty.bottom = std::max(d->dirty.bottom, bottom);
+}
+
 namespace {
 
 constexpr uint32_t kEverything = 0x80001C18u;
@@ -21,14 +29,6 @@ template <typename Hook, typename... Args>
 int call_hook(Hook hook, Args... args)
 {
     return hook ? hook(args...) : 1;
-}
-
-void mark_dirty(VELMDRAW d, int32_t left, int32_t top, int32_t right, int32_t bottom)
-{
-    d->dirty.left = std::min(d->dirty.left, left);
-    d->dirty.top = std::min(d->dirty.top, top);
-    d->dirty.right = std::max(d->dirty.right, right);
-    d->dirty.bottom = std::max(d->dirty.bottom, bottom);
 }
 
 void reset_dirty(VELMDRAW d)

@@ -9,7 +9,7 @@
 namespace {
 
 constexpr int kRate = 16000;
-constexpr uint32_t kNoScales = 0xC; // scales come later; their strips stay empty
+constexpr uint32_t kNoScales = 0xC; // the scale strips stay empty; grids still show
 
 class Golden : public ::testing::Test {
 protected:
@@ -94,6 +94,96 @@ TEST_F(Golden, SixChannelsWithThreePixelNavigatorLanes)
 TEST_F(Golden, FramedStereoWaveform)
 {
     expect_golden(speech(2), 0x1, "stereo_framed");
+}
+
+// The horizontal scale in each kind, zoomed out and in.
+class HorzScaleGolden : public Golden {
+protected:
+    void expect_kind(int kind, int64_t start, int64_t end, const char *name)
+    {
+        VELMAUDIO doc = speech();
+        ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 5, kind));
+        ASSERT_TRUE(VELMAUDIO_Zoom(doc, start, end));
+        expect_golden(doc, 0x8 | 0x1, name, 640, 160);
+        VELMAUDIO_SetDrawProperty(doc, 5, 1);
+    }
+};
+
+TEST_F(HorzScaleGolden, TimeWholeSound)
+{
+    expect_kind(1, 0, 2 * kRate, "horz_time_whole");
+}
+
+TEST_F(HorzScaleGolden, TimeMilliseconds)
+{
+    expect_kind(1, 8000, 8400, "horz_time_ms");
+}
+
+TEST_F(HorzScaleGolden, SamplesZoomedIn)
+{
+    expect_kind(0, 1000, 1100, "horz_sample_zoomed");
+}
+
+TEST_F(HorzScaleGolden, FramesWholeSound)
+{
+    expect_kind(2, 0, 2 * kRate, "horz_frame_whole");
+}
+
+TEST_F(HorzScaleGolden, TimeFromTheViewStart)
+{
+    expect_kind(4, 4321, 4321 + 6000, "horz_time_view");
+}
+
+TEST_F(HorzScaleGolden, NoGridWithFlag)
+{
+    VELMAUDIO doc = speech();
+    expect_golden(doc, 0x8 | 0x200 | 0x1, "horz_time_no_grid", 640, 160);
+}
+
+} // namespace
+
+namespace {
+
+// The value scales beside the lanes in each kind.
+class VertScaleGolden : public Golden {
+protected:
+    void expect_kind(int property, int kind, uint32_t flags, const char *name, int height = 240)
+    {
+        VELMAUDIO doc = speech(2);
+        ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, property, kind));
+        expect_golden(doc, flags, name, 640, height);
+        VELMAUDIO_SetDrawProperty(doc, property, 0);
+    }
+};
+
+TEST_F(VertScaleGolden, SampleValues)
+{
+    expect_kind(3, 0, 0x1, "vert_sample");
+}
+
+TEST_F(VertScaleGolden, Decibels)
+{
+    expect_kind(3, 1, 0x1, "vert_decibel");
+}
+
+TEST_F(VertScaleGolden, Percent)
+{
+    expect_kind(3, 2, 0x1, "vert_percent", 400);
+}
+
+TEST_F(VertScaleGolden, Normalised)
+{
+    expect_kind(3, 3, 0x1, "vert_normalized");
+}
+
+TEST_F(VertScaleGolden, HertzBesideSpectrograms)
+{
+    expect_kind(4, 0, 0x3, "vert_hertz", 400);
+}
+
+TEST_F(VertScaleGolden, MelsBesideSpectrograms)
+{
+    expect_kind(4, 1, 0x3, "vert_mels", 400);
 }
 
 } // namespace
