@@ -7,6 +7,7 @@
 #include "core/velmtimeconv.h"
 #include "edit/velmselection.h"
 #include "outside/signal/audiosignal.h"
+#include "render/view/velmscales.h"
 
 namespace {
 
@@ -96,7 +97,11 @@ int VELMAUDIO_ScrollToKeepCursorVisible(VELMAUDIO doc)
 {
     if (!loaded(doc)) return 0;
     const VELMSTATE *s = doc->state;
-    const auto margin = static_cast<int64_t>(std::trunc(static_cast<double>(s->viewEnd - s->viewBegin) * kCursorMarginFraction));
+    // One scale step once the view is drawn, else a twentieth of the window.
+    const int64_t step = doc->renderer ? VELMDRAW_GetHorzScaleStep(doc->renderer) : 0;
+    const auto margin = step > 0 ? step
+                                 : static_cast<int64_t>(std::trunc(static_cast<double>(s->viewEnd - s->viewBegin) *
+                                                                   kCursorMarginFraction));
     const int64_t c = s->cursor.position;
     int64_t delta = 0;
     if (c < s->viewBegin + margin) delta = c - (s->viewBegin + margin);

@@ -65,6 +65,12 @@ VELM_API int     VELMAUDIO_ShowMainCursor(VELMAUDIO doc);
 VELM_API int     VELMAUDIO_HideMainCursor(VELMAUDIO doc);
 VELM_API int     VELMAUDIO_ScrollToKeepCursorVisible(VELMAUDIO doc);
 
+/* ---- Positions along the horizontal scale (0 without a renderer) ---- */
+VELM_API int64_t VELMAUDIO_GetNextPosition(VELMAUDIO doc, int64_t position);
+VELM_API int64_t VELMAUDIO_GetPrevPosition(VELMAUDIO doc, int64_t position);
+VELM_API int64_t VELMAUDIO_GetNextTickPosition(VELMAUDIO doc, int64_t position);
+VELM_API int64_t VELMAUDIO_GetPrevTickPosition(VELMAUDIO doc, int64_t position);
+
 /* ---- Channels and controls ---- */
 VELM_API int      VELMAUDIO_SetChannelMask(VELMAUDIO doc, uint32_t mask);
 VELM_API uint32_t VELMAUDIO_ActiveChannelMask(VELMAUDIO doc);

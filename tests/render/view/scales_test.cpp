@@ -301,3 +301,23 @@ TEST(VertScaleArguments, NullDrawerAndBadLanesAnswerFailure)
 }
 
 } // namespace
+
+TEST_F(HorzScale, PositionsStepAlongTheScale)
+{
+    open(44100, 20.0);
+    EXPECT_EQ(VELMAUDIO_GetNextPosition(doc, 100), 0); // nothing drawn yet
+    draw(VELMDRAW_HORZ_TIME, 0, 17 * 44100);
+    ASSERT_EQ(VELMDRAW_GetHorzScaleStep(doc->renderer), 44100);
+    // Fine steps are a tenth of the scale step; tick steps two of them.
+    EXPECT_EQ(VELMAUDIO_GetNextPosition(doc, 100), 4410);
+    EXPECT_EQ(VELMAUDIO_GetNextPosition(doc, 4410), 8820);
+    EXPECT_EQ(VELMAUDIO_GetPrevPosition(doc, 4410), 0);
+    EXPECT_EQ(VELMAUDIO_GetPrevPosition(doc, 5000), 4410);
+    EXPECT_EQ(VELMAUDIO_GetNextTickPosition(doc, 1), 88200);
+    EXPECT_EQ(VELMAUDIO_GetPrevTickPosition(doc, 88200), 0);
+    // Keeping the cursor in sight leaves one scale step beside it.
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 0, 10 * 44100));
+    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, 12 * 44100));
+    ASSERT_TRUE(VELMAUDIO_ScrollToKeepCursorVisible(doc));
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 13 * 44100);
+}
