@@ -2,6 +2,7 @@
 #include "core/velmstate.h"
 
 #include <cstring>
+#include <vector>
 
 #include "core/state_internal.hpp"
 
@@ -235,16 +236,12 @@ int VELMSTATE_Assign(const VELMSTATE *source, VELMSTATE **destination)
     const VELMSTATE kept = **destination;
     // The source may live in the destination's pool; copy what we need first.
     const VELMSTATE src = *source;
-    size_t count = 0;
-    for (const VELMSELECTION *s = source->selections; s; s = s->next) ++count;
-    VELMSELECTION *ranges = count ? new VELMSELECTION[count] : nullptr;
-    size_t i = 0;
-    for (const VELMSELECTION *s = source->selections; s; s = s->next, ++i) ranges[i] = *s;
+    std::vector<VELMSELECTION> ranges;
+    for (const VELMSELECTION *s = source->selections; s; s = s->next) ranges.push_back(*s);
 
     BLMEM_ResetMemSpace(kept.pool);
     VELMSTATE *d = new_record(kept.pool);
     if (!d) {
-        delete[] ranges;
         *destination = nullptr;
         return 0;
     }
@@ -268,12 +265,11 @@ int VELMSTATE_Assign(const VELMSTATE *source, VELMSTATE **destination)
 
     d->selections = nullptr;
     VELMSELECTION **tail = &d->selections;
-    for (i = 0; i < count; ++i) {
-        VELMSELECTION *rec = velm::append_selection(d, tail, ranges[i].begin, ranges[i].end);
+    for (const VELMSELECTION &range : ranges) {
+        VELMSELECTION *rec = velm::append_selection(d, tail, range.begin, range.end);
         if (!rec) break;
         tail = &rec->next;
     }
-    delete[] ranges;
     *destination = d;
     return 1;
 }
@@ -290,10 +286,7 @@ VELMSTATE *VELMSTATE_InvertSelection(VELMSTATE *state, double duration)
     if (!state->selections) return state;
 
     struct Gap { double begin, end; };
-    size_t count = 0;
-    for (const VELMSELECTION *s = state->selections; s; s = s->next) ++count;
-    Gap *gaps = new Gap[count + 1];
-    size_t n = 0;
+    std::vector<Gap> gaps;
     const VELMSELECTION *s = state->selections;
     double start = 0.0;
     if (s->begin == 0.0) {
@@ -302,22 +295,21 @@ VELMSTATE *VELMSTATE_InvertSelection(VELMSTATE *state, double duration)
     }
     const VELMSELECTION *last = nullptr;
     for (; s; s = s->next) {
-        gaps[n++] = {start, s->begin};
+        gaps.push_back({start, s->begin});
         start = s->end;
     }
     for (last = state->selections; last->next;) last = last->next;
-    if (last->end < duration) gaps[n++] = {last->end, duration};
+    if (last->end < duration) gaps.push_back({last->end, duration});
 
     VELMSTATE *fresh = velm::rebuild_without_selections(state);
     if (fresh) {
         VELMSELECTION **tail = &fresh->selections;
-        for (size_t i = 0; i < n; ++i) {
-            VELMSELECTION *rec = velm::append_selection(fresh, tail, gaps[i].begin, gaps[i].end);
+        for (const Gap &gap : gaps) {
+            VELMSELECTION *rec = velm::append_selection(fresh, tail, gap.begin, gap.end);
             if (!rec) break;
             tail = &rec->next;
         }
     }
-    delete[] gaps;
     return fresh;
 }
 
