@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <new>
 
+#include "control/velmcontrol.h"
 #include "core/document_internal.hpp"
 #include "render/view/drawer_internal.hpp"
 
@@ -61,12 +62,14 @@ VELMDRAW VELMDRAW_Create(VELMAUDIO doc)
     drawer->document = doc;
     drawer->channels = std::min(AUDIOSIGNAL_NumChannels(doc->signal), VELMDRAW_MAX_CHANNELS);
     VELMCONFIG_InitDrawConfig(&drawer->config);
+    VELMCONTROL_Reset(drawer);
     return drawer;
 }
 
 int VELMDRAW_Destroy(VELMDRAW drawer)
 {
     if (!drawer) return 0;
+    VELMCONTROL_Stop(drawer);
     join_workers(drawer);
     for (Lane &lane : drawer->lanes) {
         destroy_wave_data(drawer->pool, lane.wave);

@@ -6,10 +6,13 @@
 #include <array>
 #include <cstdint>
 
+#include "control/control_internal.hpp"
 #include "core/velmconfig.h"
 #include "outside/base/blbase.h"
 #include "outside/signal/audiosignal.h"
 #include "outside/signal/dspb.h"
+#include "render/view/overlay_layout.hpp"
+#include "render/view/region_layer.hpp"
 #include "render/view/velmdraw.h"
 
 struct _VELMTIMEBASE {
@@ -123,7 +126,19 @@ struct DrawHooks {
     int (*vertScales)(VELMDRAW drawer) = nullptr;
     int (*horzScale)(VELMDRAW drawer, int first, int last) = nullptr;
     int (*scaleGrids)(VELMDRAW drawer, int first, int last) = nullptr;
+    // Region layers.  visibleRegions rebuilds the list of regions in view;
+    // trackScales paints the custom tracks' scale areas and trackCanvas their
+    // backgrounds (memory target); regions draws the regions of columns
+    // first .. last into the memory target; regionOnFocus and regionShadows
+    // draw on the output target; changedRegion redraws the one region that
+    // moved or changed length.
+    int (*visibleRegions)(VELMDRAW drawer) = nullptr;
+    int (*trackScales)(VELMDRAW drawer) = nullptr;
+    int (*trackCanvas)(VELMDRAW drawer, int first, int last) = nullptr;
     int (*regions)(VELMDRAW drawer, int first, int last) = nullptr;
+    int (*regionOnFocus)(VELMDRAW drawer, int first, int last) = nullptr;
+    int (*changedRegion)(VELMDRAW drawer) = nullptr;
+    int (*regionShadows)(VELMDRAW drawer) = nullptr;
     int (*overlays)(VELMDRAW drawer, uint32_t changes) = nullptr;
 };
 
@@ -205,6 +220,7 @@ struct _VELMDRAW {
     VELMAUDIO    document = nullptr;
     VELMCANVAS   canvas = nullptr;
     VELMSTATE   *state = nullptr;      // what the pixels now show
+    velm::control::Interaction control; // the pointer controller's fields
     _VELMRECT    dirty{};              // output pixels changed since the last report
     int32_t      channels = 0;         // laid out, at most 6
     int32_t      laneCount = 0;
@@ -228,6 +244,8 @@ struct _VELMDRAW {
     uint8_t      laidOut = 0;
     uint64_t     drawnChangeTime = 0;   // the document's change stamp of the last frame
     velm::view::HorzScale horzTicks;
+    velm::view::OverlayLayout overlay;
+    velm::view::RegionLayer regionLayer;
 };
 
 #endif

@@ -7,6 +7,7 @@
 #include "core/state_internal.hpp"
 #include "core/velmqueries.h"
 #include "render/view/drawer_internal.hpp"
+#include "render/view/velmoverlays.h"
 
 using namespace velm::view;
 
@@ -74,17 +75,7 @@ int draw_lanes(VELMDRAW d, int first, int last, bool main_only)
 int draw_lane_backgrounds(VELMDRAW d, int first, int last, bool main_only)
 {
     const int ok = for_lanes(d, main_only, [&](Lane &lane) { return draw_wave_background(d, &lane, first, last); });
-    if (d->state->viewFlags & 0x1000000u) return ok;
-    for (int t = 0; t < VELM_MAX_CUSTOM_TRACKS; ++t) {
-        if (!d->trackShown[static_cast<size_t>(t)]) continue;
-        if (!BLNOTIFY_SendEvent(d->document->dispatcher, nullptr, 0, 0x20050, nullptr, nullptr)) continue;
-        const _VELMRECT &a = d->trackAreas[static_cast<size_t>(t)];
-        const int from = std::max(first, 0), to = std::min(last, a.width - 1);
-        if (to < from) continue;
-        VELMCANVAS_SelectColor(d->canvas, d->config.customTrackBgBrush);
-        VELMCANVAS_FillRect(d->canvas, a.left + from, a.top, to - from + 1, a.height, 0);
-    }
-    return ok;
+    return VELMDRAW_DrawCustomCanvas(d, first, last) && ok;
 }
 
 // The slow steps for columns first .. last on the memory target.
@@ -92,6 +83,7 @@ int draw_columns(VELMDRAW d, int first, int last, bool main_only)
 {
     const DrawHooks &hooks = draw_hooks();
     int ok = process_lanes(d, first, last, main_only);
+    ok &= call_hook(hooks.visibleRegions, d);
     ok &= call_hook(hooks.horzScale, d, first, last);
     ok &= draw_lane_backgrounds(d, first, last, main_only);
     ok &= call_hook(hooks.scaleGrids, d, first, last);
@@ -117,11 +109,13 @@ int full_redraw(VELMDRAW d, uint32_t mask)
     const DrawHooks &hooks = draw_hooks();
     int ok = VELMDRAW_UpdateDrawAreas(d, 0x80000000u);
     ok &= prepare_bases(d) ? 1 : 0;
+    ok &= call_hook(hooks.visibleRegions, d);
     VELMCANVAS_SelectTarget(d->canvas, VELMCANVASTARGET_MEMORY);
     const int last = d->columns - 1;
     ok &= process_lanes(d, 0, last, false);
     if (mask & 0x400u) ok &= VELMDRAW_DrawBackground(d);
     if (mask & 0x8u) ok &= call_hook(hooks.vertScales, d);
+    ok &= call_hook(hooks.trackScales, d);
     if (mask & 0x10u) ok &= call_hook(hooks.horzScale, d, 0, last);
     ok &= draw_lane_backgrounds(d, 0, last, false);
     ok &= call_hook(hooks.scaleGrids, d, 0, last);
@@ -129,6 +123,8 @@ int full_redraw(VELMDRAW d, uint32_t mask)
     ok &= draw_lanes(d, 0, last, false);
     ok &= VELMDRAW_DrawChannelSeparators(d);
     ok &= VELMDRAW_FullRedrawFromMemory(d);
+    VELMCANVAS_SelectTarget(d->canvas, VELMCANVASTARGET_OUTPUT);
+    ok &= call_hook(hooks.regionOnFocus, d, 0, last);
     return ok;
 }
 
@@ -273,13 +269,20 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
     const bool empty = AUDIOSIGNAL_NumSamples(d->document->signal) <= 0 && (copy->viewFlags & 0x100000u);
     const DrawHooks &hooks = draw_hooks();
     switch (mask & ~0x1000u) {
-    case 0: case 0x2: case 0x80: case 0x100: case 0x180: break;
-    case 0x4: case 0x6: case 0x40: case 0x42: case 0x200: ok &= VELMDRAW_FullRedrawFromMemory(d); break;
+    case 0: case 0x2: break;
+    case 0x80: case 0x100: case 0x180: ok &= call_hook(hooks.changedRegion, d); break;
+    case 0x4: case 0x6: case 0x42: case 0x200: ok &= VELMDRAW_FullRedrawFromMemory(d); break;
+    case 0x40:
+        ok &= VELMDRAW_FullRedrawFromMemory(d);
+        ok &= call_hook(hooks.regionOnFocus, d, 0, d->columns - 1);
+        break;
     case 0x4000: ok &= call_hook(hooks.vertScales, d); break;
     case 0x811: case 0x813:
         ok &= VELMDRAW_UpdateViewWindow(d);
         ok &= VELMDRAW_DrawChannelSeparators(d);
         ok &= VELMDRAW_FullRedrawFromMemory(d);
+        VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
+        ok &= call_hook(hooks.regionOnFocus, d, 0, d->columns - 1);
         break;
     default: ok &= full_redraw(d, mask); break;
     }
@@ -291,6 +294,7 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
         VELMCANVAS_SetAlphaFactor(canvas, 1.0f);
         mark_dirty(d, 0, 0, copy->drawWidth - 1, copy->drawHeight - 1);
     } else {
+        ok &= call_hook(hooks.regionShadows, d);
         ok &= call_hook(hooks.overlays, d, mask);
     }
 

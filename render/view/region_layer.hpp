@@ -1,0 +1,28 @@
+// The regions drawn in the current view.  Part of the drawer record.
+#ifndef VELM_REGION_LAYER_HPP
+#define VELM_REGION_LAYER_HPP
+
+#include <cstdint>
+
+#include "outside/signal/audioregion.h"
+#include "render/canvas/velmrect.h"
+
+namespace velm::view {
+
+// One region inside the view window: its columns on its track's area.
+struct RegionEntry {
+    _VELMRECT area{};
+    double begin = 0.0, end = 0.0;  // samples
+    uint32_t flags = 0;             // 0x1 its track is shown, 0x2 it lies on the "default" track
+    AUDIOREGION *region = nullptr;
+};
+
+struct RegionLayer {
+    RegionEntry *entries = nullptr;  // in the drawer's pool
+    int32_t capacity = 0;
+    int32_t count = 0;
+};
+
+} // namespace velm::view
+
+#endif
