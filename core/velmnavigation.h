@@ -81,6 +81,15 @@ VELM_API int VELMAUDIO_IsControlVisible(VELMAUDIO doc, uint32_t mask);
 VELM_API int VELMAUDIO_ChangeChannelControlVisibility(VELMAUDIO doc, int slot, int control, int show);
 VELM_API int VELMAUDIO_IsChannelControlVisible(VELMAUDIO doc, int slot, uint32_t mask);
 
+/* The play cursor: its position while shown (else -1), whether it is shown,
+ * and hiding it.  The player moves and shows it. */
+VELM_API int64_t VELMAUDIO_GetPlayCursorPosition(VELMAUDIO doc);
+VELM_API int     VELMAUDIO_PlayCursorVisible(VELMAUDIO doc);
+VELM_API int     VELMAUDIO_HidePlayCursor(VELMAUDIO doc);
+/* Shows the mute indicator of each waveform display of an active channel
+ * whose playback gain is zero (all of them with force); needs a renderer. */
+VELM_API int     VELMAUDIO_UpdateMuteChannelControlsVisibility(VELMAUDIO doc, int force);
+
 VELM_EXTERN_C_END
 
 #endif /* VELMNAVIGATION_H */

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <vector>
 
+#include "control/velmcontrol.h"
 #include "core/velmnavigation.h"
 #include "edit/region_internal.hpp"
 #include "edit/velmcustomtrack.h"
@@ -16,6 +17,14 @@ constexpr uint32_t kNoScrollOnMove = 0x200;
 VELMUNDOSCRIPT *new_script(VELMAUDIO doc, const char *label)
 {
     return VELMUNDO_CreateUndoScript(VELM_TranslateString(label), doc->state);
+}
+
+// While the user drags regions, every step of the drag changes them without a
+// script: the first change, made before the drag began, holds the state the
+// whole drag undoes to.
+VELMUNDOSCRIPT *new_drag_script(VELMAUDIO doc, const char *label)
+{
+    return VELMCONTROL_IsInteracting(doc->renderer) ? nullptr : new_script(doc, label);
 }
 
 // Pushes the script when there is one; the result of the push, or 1 without one.
@@ -34,7 +43,7 @@ using EdgeChange = int (*)(AUDIOREGION *, double, int);
 int change_edge(VELMAUDIO doc, AUDIOREGION *region, double time, int mode, EdgeChange change, const char *label)
 {
     if (!usable(doc, region)) return 0;
-    VELMUNDOSCRIPT *script = new_script(doc, label);
+    VELMUNDOSCRIPT *script = new_drag_script(doc, label);
     VELMUNDO_AddRevertRegionGroupState(script, velm::identity(region));
     if (!change(region, time, mode)) {
         VELMUNDO_DestroyUndoScript(script);
@@ -134,7 +143,7 @@ int VELMAUDIO_OffsetRegions(VELMAUDIO doc, int64_t offset)
     if (!usable(doc, focused)) return 0;
     const int64_t shift = follow_shift(doc, focused, offset);
     if (offset == 0) return 1;
-    VELMUNDOSCRIPT *script = new_script(doc, "Offset Region");
+    VELMUNDOSCRIPT *script = new_drag_script(doc, "Offset Region");
     const int track = static_cast<int>(focused->flags & AUDIOREGION_TRACK_MASK);
     uint32_t mask;
     bool moved;
