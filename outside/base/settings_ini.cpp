@@ -3,7 +3,9 @@
  *
  * Layout: a key's first dotted part is its section and the rest its name, so
  * "libvelm.draw.hovertime=500" is written as "draw.hovertime=500" under
- * "[libvelm]".  Keys without a dot come first, before any section.
+ * "[libvelm]".  Keys without a dot come first, before any section.  Files
+ * written elsewhere may use a longer header: "[velm.link]" then "file=x"
+ * reads as the key "velm.link.file".
  * In values a backslash, the line breaks and a leading '{' are escaped with
  * a backslash; secret values are written as "{obscured}" and hex digits.
  */
@@ -135,7 +137,9 @@ bool ParseLine(std::string_view line, std::string &section, bool &section_ok,
         const std::string_view name = line.size() > 1 && line.back() == ']'
                                           ? Trim(line.substr(1, line.size() - 2))
                                           : std::string_view();
-        section_ok = !name.empty() && ValidKey(name) && name.find('.') == std::string_view::npos;
+        // A dotted header names the leading parts of its keys: "[velm.link]"
+        // holds the keys that begin with "velm.link.".
+        section_ok = !name.empty() && ValidKey(name);
         section = section_ok ? std::string(name) : std::string();
         return section_ok;
     }

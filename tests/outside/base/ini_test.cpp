@@ -105,6 +105,20 @@ TEST_F(IniFile, TheGlobalRegistryCanBeBacked)
     EXPECT_EQ(BLSETTINGS_GetIntEx(nullptr, "libvelm.draw.hovertime"), 700);
 }
 
+TEST_F(IniFile, DottedSectionHeadersNameTheLeadingPartsOfTheirKeys)
+{
+    WriteAll(path, "[velm.link]\nfile=speech.wav\noptions=readonly\n[velm]\nlink.format=WAVE\n[.bad]\nlost=1\n");
+    BLSETTINGS s = BLSETTINGS_Create();
+    LogCapture log;
+    ASSERT_EQ(BLSETTINGS_SetConfigFileEx(s, path.c_str(), "ini"), 1);
+    EXPECT_STREQ(BLSETTINGS_GetStringEx(s, "velm.link.file"), "speech.wav");
+    EXPECT_STREQ(BLSETTINGS_GetStringEx(s, "velm.link.options"), "readonly");
+    EXPECT_STREQ(BLSETTINGS_GetStringEx(s, "velm.link.format"), "WAVE");
+    EXPECT_EQ(BLSETTINGS_ExistsEx(s, ".bad.lost"), 0);
+    EXPECT_EQ(BLSETTINGS_ExistsEx(s, "lost"), 0);
+    BLSETTINGS_Destroy(s);
+}
+
 TEST_F(IniFile, DamagedFileLoadsWhatItCanAndIsNotRewrittenByReading)
 {
     using namespace std::string_literals;
