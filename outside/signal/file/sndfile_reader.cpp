@@ -87,6 +87,8 @@ public:
         format_.containerKind = static_cast<uint16_t>(container);
         format_.audioFormatKind = static_cast<uint16_t>(coding);
         random_ = coding_is_random_access(coding);
+        const int type = info.format & SF_FORMAT_TYPEMASK;
+        counts_in_32_bits_ = type == SF_FORMAT_WAV || type == SF_FORMAT_WAVEX;
         // Never trust the header's length beyond what the file can hold.
         int64_t capacity = random_ ? size / (int64_t{bytes_per_sample(coding)} * info.channels)
                                    : (size > INT64_MAX / kMaxFramesPerByte ? INT64_MAX : size * kMaxFramesPerByte);
@@ -146,16 +148,30 @@ private:
         int64_t second = vfile_.file_offset();
         if (sf_seek(sf_, 0, SEEK_SET) != 0) return;
         next_ = 0;
-        auto direct = std::make_unique<DirectPcm>(fd_.get(), vfile_.file_offset(), format_.audioFormatKind,
-                                                  format_.numChannels, big_endian);
-        if (second - vfile_.file_offset() != direct->bytes_per_frame()) return;
+        const int64_t start = vfile_.file_offset();
+        auto direct = std::make_unique<DirectPcm>(fd_.get(), start, format_.audioFormatKind, format_.numChannels,
+                                                  big_endian);
+        if (second - start != direct->bytes_per_frame()) return;
         // Now the length is known exactly: the frames after the first one.
-        frames_ = std::min(frames_, (vfile_.file_size() - vfile_.file_offset()) / direct->bytes_per_frame());
+        frames_ = std::min(frames_, (vfile_.file_size() - start) / direct->bytes_per_frame());
         int64_t n = std::min<int64_t>(frames_, 1024);
         std::vector<float> theirs(static_cast<size_t>(n * format_.numChannels)), ours(theirs.size());
         if (sf_readf_float(sf_, theirs.data(), n) != n || direct->read(0, ours.data(), n) != n) return;
         next_ = n;
-        if (std::memcmp(theirs.data(), ours.data(), theirs.size() * sizeof(float)) == 0) direct_ = std::move(direct);
+        if (std::memcmp(theirs.data(), ours.data(), theirs.size() * sizeof(float)) != 0) return;
+        if (counts_in_32_bits_)
+            frames_ = unwrapped_length(frames_, vfile_.file_size() - start, direct->bytes_per_frame());
+        direct_ = std::move(direct);
+    }
+
+    // A RIFF header counts the data bytes in 32 bits, so a recording of more
+    // than 4 GB written by a tool that does not switch to a 64-bit header
+    // claims its length modulo 4 GB.  The file itself tells how many whole
+    // wraps were written: trailing chunks are far smaller than 4 GB.
+    static int64_t unwrapped_length(int64_t frames, int64_t bytes_after_start, int64_t bytes_per_frame) {
+        const int64_t claimed = frames * bytes_per_frame;
+        const int64_t wraps = (bytes_after_start - claimed) >> 32;
+        return wraps > 0 ? (claimed + (wraps << 32)) / bytes_per_frame : frames;
     }
 
     UniqueFd fd_;
@@ -165,6 +181,7 @@ private:
     int64_t frames_ = 0;
     int64_t next_ = 0;  // the frame libsndfile reads next
     bool random_ = false;
+    bool counts_in_32_bits_ = false;  // RIFF sizes: 32 bits, may have wrapped
     AUDIOMETADATA *meta_ = nullptr;
     std::unique_ptr<DirectPcm> direct_;  // set when samples are read straight from the file
     std::mutex mutex_;

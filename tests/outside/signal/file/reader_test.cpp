@@ -125,6 +125,38 @@ TEST(Reader, KeepsReadingAFileDeletedOrRenamedOver) {
     EXPECT_EQ(read_all(*reader, 123), samples);
 }
 
+// A RIFF header holds 32-bit sizes: a tool that writes more than 4 GB of
+// samples without switching to a 64-bit header leaves the size modulo 4 GB.
+// The file is sparse, so the test costs no disk space.
+TEST(Reader, PlainWaveBeyondFourGigabytesOpensWithItsWholeLength) {
+    TempDir dir;
+    const std::string path = dir.file("long.wav");
+    const int64_t data_bytes = (int64_t{1} << 32) + 4000;  // stereo 16-bit frames
+    const int16_t last[4] = {1000, -1000, 2000, -2000};
+    {
+        std::FILE *f = std::fopen(path.c_str(), "wb");
+        ASSERT_NE(f, nullptr);
+        const auto u32 = [&](uint32_t v) { std::fwrite(&v, 4, 1, f); };
+        const auto u16 = [&](uint16_t v) { std::fwrite(&v, 2, 1, f); };
+        std::fputs("RIFF", f);
+        u32(static_cast<uint32_t>(36 + data_bytes));
+        std::fputs("WAVEfmt ", f);
+        u32(16), u16(1), u16(2), u32(44100), u32(44100 * 4), u16(4), u16(16);
+        std::fputs("data", f);
+        u32(static_cast<uint32_t>(data_bytes));
+        ASSERT_EQ(fseeko(f, 44 + data_bytes - 8, SEEK_SET), 0);
+        std::fwrite(last, sizeof last, 1, f);
+        ASSERT_EQ(std::fclose(f), 0);
+    }
+    auto reader = open_reader(path.c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr);
+    ASSERT_EQ(reader->frames(), data_bytes / 4);
+    float got[4] = {};
+    ASSERT_EQ(reader->read(reader->frames() - 2, got, 2), 2);
+    for (int i = 0; i < 4; ++i) EXPECT_FLOAT_EQ(got[i], last[i] / 32768.0f) << i;
+    EXPECT_EQ(reader->read(reader->frames(), got, 1), 0);
+}
+
 TEST(Reader, ReadsHeadlessFilesAsTheFormatStringSays) {
     TempDir dir;
     std::string path = dir.file("x.raw");
