@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "../render/view/view_support.hpp"
+#include "guiapp.h"
 #include "widgets/display/velmdrawcommon.h"
 
 namespace {
@@ -33,6 +34,7 @@ VELMCONFIGFONT test_font(float size = 20.0f)
 // A black canvas painted by `paint`, returned as an image.
 QImage paint(int width, int height, const std::function<void(VELMCANVAS)> &paint)
 {
+    MakeGuiApplication();
     viewtest::Canvas canvas(width, height);
     QPainter painter;
     VELMCANVAS_BeginDraw(canvas.get(), &painter);
