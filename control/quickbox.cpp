@@ -20,6 +20,27 @@ int32_t extent(int32_t origin, int32_t corner)
     return static_cast<int32_t>(std::clamp<int64_t>(size, INT32_MIN, INT32_MAX));
 }
 
+// One end of a scale-range selection (vertical or spectral).
+using RangeEnd = double VELMSTATE::*;
+
+// A new range: both ends at value; drawn once it has an extent.
+int start_range(VELMAUDIO doc, RangeEnd start, RangeEnd end, double value)
+{
+    VELMSTATE *s = view_state(doc);
+    if (!s) return 0;
+    s->*start = s->*end = value;
+    return 1;
+}
+
+int end_range(VELMAUDIO doc, RangeEnd end, double value)
+{
+    VELMSTATE *s = view_state(doc);
+    if (!s) return 0;
+    s->*end = value;
+    VELMSTATE_NotifyChanges(doc, 0);
+    return 1;
+}
+
 } // namespace
 
 int VELMAUDIO_StartQuickBox(VELMAUDIO doc, int x, int y)
@@ -56,34 +77,20 @@ int VELMAUDIO_ClearQuickBox(VELMAUDIO doc)
 
 int VELMAUDIO_StartVerticalScaleSelection(VELMAUDIO doc, double value)
 {
-    VELMSTATE *s = view_state(doc);
-    if (!s) return 0;
-    s->vertSelectionStart = s->vertSelectionEnd = value;
-    return 1;
+    return start_range(doc, &VELMSTATE::vertSelectionStart, &VELMSTATE::vertSelectionEnd, value);
 }
 
 int VELMAUDIO_EndVerticalScaleSelection(VELMAUDIO doc, double value)
 {
-    VELMSTATE *s = view_state(doc);
-    if (!s) return 0;
-    s->vertSelectionEnd = value;
-    VELMSTATE_NotifyChanges(doc, 0);
-    return 1;
+    return end_range(doc, &VELMSTATE::vertSelectionEnd, value);
 }
 
 int VELMAUDIO_StartSpecScaleSelection(VELMAUDIO doc, double value)
 {
-    VELMSTATE *s = view_state(doc);
-    if (!s) return 0;
-    s->spectralSelectionStart = s->spectralSelectionEnd = value;
-    return 1;
+    return start_range(doc, &VELMSTATE::spectralSelectionStart, &VELMSTATE::spectralSelectionEnd, value);
 }
 
 int VELMAUDIO_EndSpecScaleSelection(VELMAUDIO doc, double value)
 {
-    VELMSTATE *s = view_state(doc);
-    if (!s) return 0;
-    s->spectralSelectionEnd = value;
-    VELMSTATE_NotifyChanges(doc, 0);
-    return 1;
+    return end_range(doc, &VELMSTATE::spectralSelectionEnd, value);
 }

@@ -2,6 +2,7 @@
 // widths, and which cells come out dim or bright.
 #include <QImage>
 #include <QPainter>
+#include <QRect>
 #include <cmath>
 #include <cstdio>
 #include <functional>
@@ -129,30 +130,14 @@ QImage frame_image(uint32_t options, int64_t frame, int64_t offset)
     return paint(260, 40, [&](VELMCANVAS c) { VELMDRAWCOMMON_DrawDisplayFrame(c, &font, options, kLeft, kTop, frame, offset); });
 }
 
-// Leftmost and one past the rightmost inked column.
-std::pair<int, int> ink_columns(const QImage &image)
+// Bounding box of the ink within columns [from, to); empty without ink.
+QRect ink_box(const QImage &image, int from = 0, int to = -1)
 {
-    int first = image.width(), last = -1;
+    QRect box;
     for (int y = 0; y < image.height(); ++y)
-        for (int x = 0; x < image.width(); ++x)
-            if (qRed(image.pixel(x, y)) > 24 || qBlue(image.pixel(x, y)) > 24) {
-                first = std::min(first, x);
-                last = std::max(last, x);
-            }
-    return {first, last + 1};
-}
-
-// Topmost and one past the lowest inked row within columns [from, to).
-std::pair<int, int> ink_rows(const QImage &image, int from, int to)
-{
-    int first = image.height(), last = -1;
-    for (int y = 0; y < image.height(); ++y)
-        for (int x = from; x < to; ++x)
-            if (qRed(image.pixel(x, y)) > 24 || qBlue(image.pixel(x, y)) > 24) {
-                first = std::min(first, y);
-                last = std::max(last, y);
-            }
-    return {first, last + 1};
+        for (int x = from; x < (to < 0 ? image.width() : to); ++x)
+            if (qRed(image.pixel(x, y)) > 24 || qBlue(image.pixel(x, y)) > 24) box |= QRect(x, y, 1, 1);
+    return box;
 }
 
 TEST(DrawCommonGolden, EveryUnitInItsOptionCombinations)
@@ -219,11 +204,11 @@ TEST(DrawCommonWidth, InkStaysInsideTheAnnouncedWidth)
     });
     const QImage images[3] = {time_image(0x1, 86399.999), sample_image(0x1, 8888888888), frame_image(0x1, 8888888, 8888)};
     for (int i = 0; i < 3; ++i) {
-        const auto [first, end] = ink_columns(images[i]);
-        EXPECT_GE(first, kLeft) << i;
-        EXPECT_LE(end, kLeft + widths[i]) << i;
+        const QRect ink = ink_box(images[i]);
+        EXPECT_GE(ink.left(), kLeft) << i;
+        EXPECT_LT(ink.right(), kLeft + widths[i]) << i;
         // Full-width values use most of it.
-        EXPECT_GT(end - kLeft, widths[i] * 3 / 4) << i;
+        EXPECT_GT(ink.right() - kLeft, widths[i] * 3 / 4) << i;
     }
 }
 
@@ -247,7 +232,7 @@ TEST(DrawCommonDigits, SignCellIsBrightOnlyForRemainingTime)
     // Without the sign cell the first digit starts at x.
     const QImage unsigned_time = time_image(0x5, 5.0);
     EXPECT_EQ(ink_between(unsigned_time, kLeft, kLeft + m.digit), Ink::Dim);
-    EXPECT_LT(ink_columns(unsigned_time).first, kLeft + m.sign);
+    EXPECT_LT(ink_box(unsigned_time).left(), kLeft + m.sign);
 }
 
 TEST(DrawCommonDigits, SamplesBrightenFromTheFirstSignificantDigit)
@@ -268,10 +253,10 @@ TEST(DrawCommonDigits, FrameOffsetIsSmallerAndLower)
     EXPECT_EQ(pattern(cell_inks(image, m, "0000125 0037", 8)), "DDDDDBBB.BBBB");
     const int frame_from = kLeft + m.sign + 4 * m.digit;
     const int offset_from = kLeft + m.sign + 7 * m.digit + m.separator;
-    const auto frame_rows = ink_rows(image, frame_from, frame_from + 3 * m.digit);
-    const auto offset_rows = ink_rows(image, offset_from + 2 * m.small_digit, offset_from + 4 * m.small_digit);
-    EXPECT_LT(offset_rows.second - offset_rows.first, frame_rows.second - frame_rows.first);
-    EXPECT_GT(offset_rows.first, frame_rows.first);
+    const QRect frame_ink = ink_box(image, frame_from, frame_from + 3 * m.digit);
+    const QRect offset_ink = ink_box(image, offset_from + 2 * m.small_digit, offset_from + 4 * m.small_digit);
+    EXPECT_LT(offset_ink.height(), frame_ink.height());
+    EXPECT_GT(offset_ink.top(), frame_ink.top());
     EXPECT_EQ(frame_image(0x2, 125, 37), frame_image(0, 0, 0));
 }
 
@@ -311,7 +296,7 @@ TEST(DrawCommonArguments, NullCanvasOrFontDrawsNothing)
         EXPECT_EQ(VELMDRAWCOMMON_DrawDisplayFrame(c, nullptr, 0, 0, 0, 1, 1), 0);
         EXPECT_EQ(VELMDRAWCOMMON_DrawDisplayFrameWidth(c, nullptr, 0), 0);
     });
-    EXPECT_EQ(ink_columns(image).second, 0);
+    EXPECT_TRUE(ink_box(image).isEmpty());
 }
 
 } // namespace
