@@ -189,7 +189,8 @@ uint32_t region(VELMDRAW d, uint32_t code, int x, int y)
 {
     const velm::view::RegionLayer &layer = d->regionLayer;
     if (!(code & kCustomTrack) || !layer.entries) return code;
-    for (int r = 0; r < layer.count; ++r) {
+    const int count = std::min(layer.count, layer.capacity);
+    for (int r = 0; r < count; ++r) {
         const velm::view::RegionEntry &entry = layer.entries[r];
         if (VELMAUDIO_IsRegionDeleted(d->document, entry.region)) continue;
         const auto index = static_cast<uint32_t>(r);

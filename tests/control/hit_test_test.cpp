@@ -260,14 +260,13 @@ TEST_F(HitTest, RegionsInsideCustomTracks)
     entries[1].region = kept;
     entries[0].area = entries[1].area = rect(t.left + 100, t.top, 60, t.height);
     drawer()->regionLayer.entries = entries;
-    drawer()->regionLayer.count = 2;
+    drawer()->regionLayer.count = drawer()->regionLayer.capacity = 2;
     const int y = mid_y(t);
     EXPECT_EQ(at(t.left + 130, y), 0x18001u);
     EXPECT_EQ(at(t.left + 100, y), 0x28001u);
     EXPECT_EQ(at(t.left + 159, y), 0x48001u);
     EXPECT_EQ(at(t.left + 170, y), 0x8000u | static_cast<uint32_t>(track));
-    drawer()->regionLayer.entries = nullptr;
-    drawer()->regionLayer.count = 0;
+    drawer()->regionLayer = velm::view::RegionLayer{};
 }
 
 TEST_F(HitTest, ZoomLimitZonesAndHandles)
