@@ -50,7 +50,8 @@ uint32_t with_index(uint32_t code, uint32_t kind, uint32_t index)
     return (code & ~kIndexBits) | kind | (index & kIndexBits);
 }
 
-// The first sample of the display column under x; 0 off any mapping.
+// The first sample of the display column under x (the mapping answers -1
+// before the first layout).
 int64_t sample_at(VELMDRAW d, int x)
 {
     const double s = std::floor(VELMDRAW_ConvertDisplayXtoRealX(d, VELMDRAW_ConvertCanvasXtoAreaX(d, x)));
