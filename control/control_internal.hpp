@@ -5,6 +5,7 @@
 
 #include <cstdint>
 
+#include "control/velmcontrol.h"
 #include "core/velmstate.h"
 #include "core/velmtimer.h"
 
@@ -48,7 +49,7 @@ struct Interaction {
     uint32_t pressFlags = 0;
     uint32_t keyState = 0;
     uint32_t buttonReleased = 1;
-    VELMSELECTION *selectionUnderPointer = nullptr;
+    const VELMSELECTION *selectionUnderPointer = nullptr; // a draggable selection, when audio drag is on
     VELMSELECTION *slidSelection = nullptr;
     VELMTIMER repeatTimer = nullptr;
     VELMTIMER hoverTimer = nullptr;  // hover timer while up; press timer while a region is held

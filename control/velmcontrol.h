@@ -34,6 +34,33 @@ VELM_API int64_t VELMCONTROL_GetSlidingSelectionSample(VELMDRAW drawer);
 /* The code of the object under the pointer (0 when none). */
 VELM_API uint32_t VELMCONTROL_GetMouseOverObject(VELMDRAW drawer);
 
+/* The hit test: classifies the object of the last drawn layout under the
+ * last pointer position and stores its code.  When the code changes while
+ * no button is held, 0x20032 goes to the document's dispatcher with pointers
+ * to the new and the old code; a handler may rewrite the new one, and what
+ * it leaves is stored.  The frame runs it after every draw.  0 without a
+ * drawn view. */
+VELM_API int VELMCONTROL_UpdateMouseOverObject(VELMDRAW drawer);
+/* Records the pointer position (canvas pixels) and runs the hit test: the
+ * step every pointer handler starts with.  0 for a null drawer, one not yet
+ * drawn, or while another controller call is running. */
+VELM_API int VELMCONTROL_SetPointer(VELMDRAW drawer, int x, int y);
+
+/* The quick (zoom) box and the scale-range selections of a document's view
+ * state; each is 0 for a null document or one without view state, else 1.
+ * Start sets origin and corner to (x, y) with size 0 x 0 and sends 0x2002F
+ * with pointers to x and y; Update moves the corner, the size counting both
+ * ends (negative when dragged up or left); Clear zeroes the box and sends
+ * 0x20030.  The Start calls of the scale ranges set both ends and notify
+ * nothing; the End calls move the end. */
+VELM_API int VELMAUDIO_StartQuickBox(VELMAUDIO doc, int x, int y);
+VELM_API int VELMAUDIO_UpdateQuickBox(VELMAUDIO doc, int x, int y);
+VELM_API int VELMAUDIO_ClearQuickBox(VELMAUDIO doc);
+VELM_API int VELMAUDIO_StartVerticalScaleSelection(VELMAUDIO doc, double value);
+VELM_API int VELMAUDIO_EndVerticalScaleSelection(VELMAUDIO doc, double value);
+VELM_API int VELMAUDIO_StartSpecScaleSelection(VELMAUDIO doc, double value);
+VELM_API int VELMAUDIO_EndSpecScaleSelection(VELMAUDIO doc, double value);
+
 /* The document's renderer's answers; 0 without a renderer. */
 VELM_API int VELMAUDIO_IsInteracting(VELMAUDIO doc);
 VELM_API int VELMAUDIO_IsSelecting(VELMAUDIO doc);

@@ -308,6 +308,7 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
     if (old) VELMSTATE_Destroy(old);
     velm::refresh_top_parent(d->state);
     if (size_changed) notify_size(d);
+    VELMCONTROL_UpdateMouseOverObject(d);
     MutexUnlock(d->lock);
     if (!ok) BLDEBUG_Log(0, "VELMDRAW_UpdateDraw: Update operation failed in one or more steps!");
     return ok ? 1 : 0;

@@ -14,9 +14,15 @@
 
 VELM_EXTERN_C_BEGIN
 
-/* Options: bit 0x1 a bright minus sign (remaining time), 0x2 zeros instead
+/* The canvas must be painting (fonts are selected only then).  The draw
+ * calls return the width they advanced, 0 for a null canvas or font; x and
+ * y are the top left of the first cell.
+ *
+ * Options: bit 0x1 a bright minus sign (remaining time), 0x2 zeros instead
  * of the value, 0x4 no sign cell, 0x8 hours folded into minutes, 0x10
- * minutes folded into seconds. */
+ * hours and minutes folded into seconds (wins over 0x8).  A negative value
+ * draws its magnitude: the sign cell follows the options alone.  Times are
+ * rounded to the nearest millisecond. */
 VELM_API int VELMDRAWCOMMON_DrawDisplayTime(VELMCANVAS canvas, const VELMCONFIGFONT *font, uint32_t options, int x,
                                             int y, double seconds);
 VELM_API int VELMDRAWCOMMON_DrawDisplaySample(VELMCANVAS canvas, const VELMCONFIGFONT *font, uint32_t options, int x,
