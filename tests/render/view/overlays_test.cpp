@@ -5,11 +5,13 @@
 
 #include <QImage>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "core/document_internal.hpp"
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
+#include "edit/velmcustomtrack.h"
 #include "edit/velmselection.h"
 #include "render/view/drawer_internal.hpp"
 #include "render/view/velmoverlays.h"
@@ -372,6 +374,177 @@ TEST_F(Overlays, QuickBoxIsOrderedAndCutToItsLane)
     EXPECT_GT(lift(lane.left + 150, lane.top + 20), lift(lane.left + 150, lane.top + 19));
     EXPECT_GT(lift(lane.left + 150, lane.top + 19), 0);
     EXPECT_EQ(image.pixel(lane.left + 150, lane.top + 40), bare.pixel(lane.left + 150, lane.top + 40));
+}
+
+TEST_F(Overlays, SelectionHandlesAreRecordedInDrawingOrder)
+{
+    VELMAUDIO doc = open(kWave);
+    viewtest::Canvas canvas(kWidth, kHeight);
+    zoom_to_grid(canvas, doc, 100);
+    // The first begins before the view, the second follows it after one
+    // column, the third runs past the view's end.
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, sample_at(60), sample_at(200)));
+    ASSERT_TRUE(VELMAUDIO_AddSelection(doc, sample_at(202), sample_at(300)));
+    ASSERT_TRUE(VELMAUDIO_AddSelection(doc, sample_at(400), sample_at(100 + display.width + 50)));
+    ASSERT_TRUE(canvas.draw(doc));
+    const auto &layout = doc->renderer->overlay;
+    ASSERT_EQ(layout.selectionSliderCount, 3);
+    const auto centre = [](const _VELMRECT &r) { return r.left + r.width / 2; };
+    double previous = -1.0;
+    for (int i = 0; i < 3; ++i) {
+        const auto &slider = layout.selectionSliders[static_cast<size_t>(i)];
+        ASSERT_NE(slider.selection, nullptr);
+        EXPECT_GT(slider.selection->begin, previous);
+        previous = slider.selection->begin;
+        EXPECT_EQ(slider.display.left, display.left);
+    }
+    const auto &first = layout.selectionSliders[0], &second = layout.selectionSliders[1],
+               &third = layout.selectionSliders[2];
+    EXPECT_EQ(first.begin.width, 0);               // its begin is out of view
+    EXPECT_EQ(centre(first.end), x_of(100));
+    EXPECT_EQ(centre(second.begin), x_of(102));
+    EXPECT_EQ(centre(second.end), x_of(200));
+    EXPECT_EQ(centre(third.begin), x_of(300));
+    EXPECT_EQ(third.end.width, 0);                 // its end is out of view
+    // The handles stand on the row above the horizontal scale.
+    _VELMRECT horz{};
+    ASSERT_TRUE(VELMAUDIO_GetDrawAreaRect(doc, VELMDRAW_AREA_HORZSCALE, &horz));
+    EXPECT_EQ(second.begin.top + second.begin.height / 2, horz.top - 1);
+}
+
+TEST_F(Overlays, ViewFlagsHideCursorsAndSelections)
+{
+    VELMAUDIO doc = open(kWave);
+    viewtest::Canvas canvas(kWidth, kHeight);
+    zoom_to_grid(canvas, doc);
+    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, sample_at(300)));
+    ASSERT_TRUE(VELMAUDIO_HideMainCursor(doc));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QImage bare = canvas.output();
+
+    ASSERT_TRUE(VELMAUDIO_ShowMainCursor(doc));
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, sample_at(100), sample_at(200)));
+    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, sample_at(300)));
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 2, static_cast<int32_t>(kWave | 0x400000 | 0x800000)));
+    ASSERT_TRUE(canvas.draw(doc));
+    EXPECT_EQ(viewtest::count_differences(bare, canvas.output()), 0);
+    EXPECT_EQ(doc->renderer->overlay.selectionSliderCount, 0);
+
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 2, static_cast<int32_t>(kWave)));
+    ASSERT_TRUE(canvas.draw(doc));
+    EXPECT_GT(viewtest::count_differences(bare, canvas.output()), 0);
+    EXPECT_EQ(doc->renderer->overlay.selectionSliderCount, 1);
+}
+
+TEST_F(Overlays, ScrollingKeepsSelectionsAsAFullDrawShowsThem)
+{
+    VELMAUDIO scrolled = open(kWave | 0x4000);
+    VELMAUDIO direct = open(kWave | 0x4000);
+    viewtest::Canvas a(kWidth, 300), b(kWidth, 300);
+    zoom_to_grid(a, scrolled);
+    for (VELMAUDIO doc : {scrolled, direct}) {
+        ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, sample_at(150), sample_at(260)));
+        ASSERT_TRUE(VELMAUDIO_AddSelection(doc, sample_at(400), sample_at(480)));
+        ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, sample_at(420)));
+    }
+    ASSERT_TRUE(a.draw(scrolled));
+    const int64_t length = int64_t{display.width - 1} * kStep;
+    ASSERT_TRUE(VELMAUDIO_Zoom(scrolled, sample_at(37), sample_at(37) + length));
+    ASSERT_TRUE(a.draw(scrolled));
+    ASSERT_TRUE(b.draw(direct));
+    ASSERT_TRUE(VELMAUDIO_Zoom(direct, sample_at(37), sample_at(37) + length));
+    ASSERT_TRUE(b.draw(direct));
+    EXPECT_EQ(viewtest::count_differences(a.output(), b.output()), 0);
+}
+
+TEST_F(Overlays, ZoomButtonShowsTheSmartZoomAction)
+{
+    VELMAUDIO doc = open(0x1 | 0x4000 | 0x40000);
+    viewtest::Canvas canvas(kWidth, 300);
+    ASSERT_TRUE(VELMAUDIO_ChangeSmartZoomAction(doc, 0));
+    ASSERT_TRUE(canvas.draw(doc));
+    const _VELMRECT button = doc->renderer->zoomButton;
+    ASSERT_EQ(button.width, 20);
+    const QImage none = canvas.output().copy(button.left, button.top, button.width, button.height);
+    std::vector<QImage> faces;
+    for (int action : {2, 3, 4}) {
+        ASSERT_TRUE(VELMAUDIO_ChangeSmartZoomAction(doc, action));
+        ASSERT_TRUE(canvas.draw(doc));
+        faces.push_back(canvas.output().copy(button.left, button.top, button.width, button.height));
+        EXPECT_GT(viewtest::count_differences(none, faces.back()), 0) << action;
+    }
+    EXPECT_GT(viewtest::count_differences(faces[0], faces[1]), 0);
+    EXPECT_GT(viewtest::count_differences(faces[1], faces[2]), 0);
+}
+
+// The label's columns: where the picture with the label differs from the
+// same state drawn without it.
+std::pair<int, int> label_columns(viewtest::Canvas &canvas, VELMAUDIO doc, uint32_t flags)
+{
+    VELMAUDIO_SetDrawProperty(doc, 2, static_cast<int32_t>(flags));
+    canvas.draw(doc);
+    const QImage without = canvas.output();
+    VELMAUDIO_SetDrawProperty(doc, 2, static_cast<int32_t>(flags | 0x20000));
+    canvas.draw(doc);
+    const std::vector<int> columns = differing_columns(without, canvas.output());
+    return columns.empty() ? std::pair{-1, -1} : std::pair{columns.front(), columns.back()};
+}
+
+TEST_F(Overlays, SelectingLabelStandsBesideTheBeginOrLeftOfTheCursor)
+{
+    VELMAUDIO doc = open(kWave);
+    ASSERT_TRUE(VELMAUDIO_SetDrawProperty(doc, 5, 0)); // samples
+    viewtest::Canvas canvas(kWidth, kHeight);
+    zoom_to_grid(canvas, doc);
+    ASSERT_TRUE(VELMAUDIO_SetSelectingKind(doc, SELECTING_ADD));
+    // Dragged leftwards: the cursor follows the moving end, here the begin.
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, sample_at(500), sample_at(100)));
+    const auto [left, right] = label_columns(canvas, doc, kWave);
+    EXPECT_EQ(left, x_of(100) + 5);
+    ASSERT_GT(right, left + 40);
+    const int width = right - left + 1;
+
+    // With the cursor at the moving end the box keeps clear of it.
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, sample_at(100), sample_at(500)));
+    const auto [left2, right2] = label_columns(canvas, doc, kWave);
+    EXPECT_EQ(right2, x_of(500) - 5 - 1);
+    EXPECT_EQ(right2 - left2 + 1, width);
+
+    // Never past the display's right end.
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, sample_at(display.width - 2), sample_at(display.width - 20)));
+    const auto [left3, right3] = label_columns(canvas, doc, kWave);
+    EXPECT_EQ(right3, display.left + display.width - 5 - 1);
+    EXPECT_EQ(right3 - left3 + 1, width);
+}
+
+TEST_F(Overlays, CursorsAndSelectionsCrossCustomTracksWithoutTrails)
+{
+    VELMAUDIO doc = open(kWave);
+    ASSERT_TRUE(VELMAUDIO_AddCustomTrack(doc, "words"));
+    ASSERT_TRUE(VELMAUDIO_ShowCustomTrack(doc, "words"));
+    viewtest::Canvas canvas(kWidth, 300);
+    zoom_to_grid(canvas, doc);
+    const int id = VELMAUDIO_FindCustomTrackId(doc, "words");
+    ASSERT_GE(id, 0);
+    const _VELMRECT track = doc->renderer->trackAreas[static_cast<size_t>(id)];
+    ASSERT_GT(track.height, 4);
+    ASSERT_GT(track.top, display.bottom);
+    const int y = track.top + track.height / 2;
+    const QImage bare = canvas.output();
+
+    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, sample_at(150)));
+    ASSERT_TRUE(canvas.draw(doc));
+    EXPECT_NE(canvas.output().pixel(x_of(150), y), bare.pixel(x_of(150), y));
+    EXPECT_NE(canvas.output().pixel(x_of(147), y), bare.pixel(x_of(147), y)); // its shadow
+
+    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, sample_at(300)));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QImage moved = canvas.output();
+    for (int c = 140; c <= 160; ++c) EXPECT_EQ(moved.pixel(x_of(c), y), bare.pixel(x_of(c), y)) << c;
+
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, sample_at(200), sample_at(260)));
+    ASSERT_TRUE(canvas.draw(doc));
+    EXPECT_GT(brightness(canvas.output().pixel(x_of(230), y)), brightness(bare.pixel(x_of(230), y)));
 }
 
 TEST_F(Overlays, RefusesMissingHandlesAndRenderers)
