@@ -135,9 +135,9 @@ int update_selecting(VELMDRAW d, const VELMSTATE *drawn, const VELMSTATE *state)
     const int b1 = has ? column_of_time(d, base, now.begin) : 0, e1 = has ? column_of_time(d, base, now.end) : -1;
     if (!had) return has ? draw_selecting(d, state, b1, e1) : 1;
     if (!has) return restore_columns(d, state, b0, e0);
-    // A flip over the anchor, or a jump to columns the old one never met:
-    // start again from the slow picture.
-    if (b0 == e1 || e0 == b1 || e1 < b0 || b1 > e0) {
+    // A flip over the anchor, a jump to columns the old one never met or a
+    // new colour: start again from the slow picture.
+    if (b0 == e1 || e0 == b1 || e1 < b0 || b1 > e0 || drawn->selectingKind != state->selectingKind) {
         int ok = restore_columns(d, state, b0, e0);
         return draw_selecting(d, state, b1, e1) && ok;
     }

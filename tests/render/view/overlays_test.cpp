@@ -282,6 +282,29 @@ TEST_F(Overlays, IncrementalSelectingEqualsAFullRedraw)
     EXPECT_EQ(viewtest::compare_golden(a.output(), "overlay_selecting"), "");
 }
 
+TEST_F(Overlays, SelectionBeingMadeTakesTheColourOfItsKind)
+{
+    VELMAUDIO doc = open(kWave);
+    viewtest::Canvas canvas(kWidth, kHeight);
+    zoom_to_grid(canvas, doc);
+    const QImage bare = canvas.output();
+    const int x = x_of(250), y = display.top + 3;
+    ASSERT_TRUE(VELMAUDIO_SetSelectingKind(doc, SELECTING_SUBTRACT));
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, sample_at(200), sample_at(300)));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QRgb red = canvas.output().pixel(x, y);
+    EXPECT_GT(qRed(red) - qRed(bare.pixel(x, y)), 60);
+    EXPECT_LE(qBlue(red), qBlue(bare.pixel(x, y)));
+
+    // Same columns, another kind: the columns are painted again.
+    ASSERT_TRUE(VELMAUDIO_SetSelectingKind(doc, SELECTING_ADD));
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, sample_at(200), sample_at(300)));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QRgb green = canvas.output().pixel(x, y);
+    EXPECT_GT(qBlue(green), qBlue(bare.pixel(x, y)));
+    EXPECT_LE(qRed(green), qRed(bare.pixel(x, y)));
+}
+
 TEST_F(Overlays, NavigatorShowsTheVisibleWindow)
 {
     VELMAUDIO doc = open(kWave | 0x4000);
