@@ -120,8 +120,8 @@ constexpr int kMaxLanes = 3 * VELMDRAW_MAX_CHANNELS;
 // Samples read on each side of the view for the spline (analog mode).
 constexpr int kSplineMargin = 10;
 
-// Steps of the frame that later parts of the renderer draw (scales and
-// overlays).  A null entry draws nothing.
+// Steps of the frame that other parts of the renderer draw (scales and
+// regions).  A null entry draws nothing.
 struct DrawHooks {
     int (*vertScales)(VELMDRAW drawer) = nullptr;
     int (*horzScale)(VELMDRAW drawer, int first, int last) = nullptr;
@@ -139,7 +139,6 @@ struct DrawHooks {
     int (*regionOnFocus)(VELMDRAW drawer, int first, int last) = nullptr;
     int (*changedRegion)(VELMDRAW drawer) = nullptr;
     int (*regionShadows)(VELMDRAW drawer) = nullptr;
-    int (*overlays)(VELMDRAW drawer, uint32_t changes) = nullptr;
 };
 
 DrawHooks &draw_hooks();

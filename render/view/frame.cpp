@@ -6,13 +6,23 @@
 #include "core/document_internal.hpp"
 #include "core/state_internal.hpp"
 #include "core/velmqueries.h"
+#include "core/velmnavigation.h"
 #include "render/view/drawer_internal.hpp"
+#include "render/view/overlay_internal.hpp"
 #include "render/view/velmoverlays.h"
 
 using namespace velm::view;
 
 void velm::view::mark_dirty(VELMDRAW d, int32_t left, int32_t top, int32_t right, int32_t bottom)
 {
+    // Overlays may reach past the view's edges; only the view is reported.
+    if (d->state) {
+        left = std::max(left, 0);
+        top = std::max(top, 0);
+        right = std::min(right, d->state->drawWidth - 1);
+        bottom = std::min(bottom, d->state->drawHeight - 1);
+    }
+    if (right < left || bottom < top) return;
     d->dirty.left = std::min(d->dirty.left, left);
     d->dirty.top = std::min(d->dirty.top, top);
     d->dirty.right = std::max(d->dirty.right, right);
@@ -125,6 +135,97 @@ int full_redraw(VELMDRAW d, uint32_t mask)
     ok &= VELMDRAW_FullRedrawFromMemory(d);
     VELMCANVAS_SelectTarget(d->canvas, VELMCANVASTARGET_OUTPUT);
     ok &= call_hook(hooks.regionOnFocus, d, 0, last);
+    return ok;
+}
+
+// Output target after a restore from memory: the selections and the
+// navigator's state over the slow picture.
+int draw_selection_overlays(VELMDRAW d)
+{
+    int ok = draw_selection_list(d, d->state, 0, d->columns - 1);
+    return VELMDRAW_DrawNavigatorState(d) && ok;
+}
+
+// The partial or full redraw that the change mask asks for; `drawn` is the
+// state the pixels showed before.
+int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
+{
+    const DrawHooks &hooks = draw_hooks();
+    VELMCANVAS canvas = d->canvas;
+    const int last = d->columns - 1;
+    int ok = 1;
+    switch (mask & ~0x1000u) {
+    case 0: break;
+    case 0x2:
+        ok &= update_selecting(d, drawn, d->state);
+        ok &= VELMDRAW_UpdateNavigatorSelecting(d);
+        break;
+    case 0x4: case 0x6: case 0x42:
+        ok &= VELMDRAW_FullRedrawFromMemory(d);
+        ok &= draw_selection_overlays(d);
+        break;
+    case 0x40:
+        ok &= VELMDRAW_FullRedrawFromMemory(d);
+        ok &= call_hook(hooks.regionOnFocus, d, 0, last);
+        ok &= draw_selection_overlays(d);
+        break;
+    case 0x80: case 0x100: case 0x180: ok &= call_hook(hooks.changedRegion, d); break;
+    case 0x200:
+        ok &= VELMDRAW_FullRedrawFromMemory(d);
+        ok &= draw_selection_list(d, d->state, 0, last);
+        ok &= VELMDRAW_ShowQuickBox(d, &d->state->quickBox);
+        ok &= VELMDRAW_DrawNavigatorState(d);
+        break;
+    case 0x4000: ok &= call_hook(hooks.vertScales, d); break;
+    case 0x811: case 0x813:
+        ok &= VELMDRAW_UpdateViewWindow(d);
+        ok &= VELMDRAW_UpdateNavigator(d);
+        ok &= VELMDRAW_DrawChannelSeparators(d);
+        ok &= VELMDRAW_FullRedrawFromMemory(d);
+        VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
+        ok &= call_hook(hooks.regionOnFocus, d, 0, d->columns - 1);
+        ok &= draw_selection_overlays(d);
+        break;
+    default:
+        ok &= full_redraw(d, mask);
+        ok &= draw_selection_overlays(d);
+        break;
+    }
+    VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
+    return ok;
+}
+
+// What every frame draws last on the output target, each piece saving the
+// pixels it covers.  Gain buttons belong here while playing; without a
+// player there is no playing yet.
+int draw_overlay_tail(VELMDRAW d, bool empty)
+{
+    const VELMSTATE *s = d->state;
+    OverlayLayout &layout = d->overlay;
+    int ok = 1;
+    layout.zoomLimitHandles = {};
+    if (!empty) ok &= draw_selecting_label(d, s);
+    if (VELMAUDIO_HasZoomLimit(d->document) && (s->controls & 0x2u)) {
+        ok &= draw_zoom_limit_bar(d, 1);
+        ok &= draw_zoom_limit_bar(d, 2);
+    }
+    layout.cursorSliders = {};
+    if (empty) {
+        layout.selectionSliderCount = 0;
+        VELMCANVAS_SetAlphaFactor(d->canvas, 0.5f);
+        VELMCANVAS_SelectColor(d->canvas, 0);
+        VELMCANVAS_FillRect(d->canvas, 0, 0, s->drawWidth, s->drawHeight, 0);
+        VELMCANVAS_SetAlphaFactor(d->canvas, 1.0f);
+        mark_dirty(d, 0, 0, s->drawWidth - 1, s->drawHeight - 1);
+        return ok;
+    }
+    ok &= VELMDRAW_DrawZoomButton(d);
+    ok &= call_hook(draw_hooks().regionShadows, d);
+    ok &= VELMDRAW_DrawSelectionsSlider(d, 0, d->columns - 1);
+    ok &= draw_navigator_cursor(d, s->cursor);
+    ok &= draw_navigator_cursor(d, s->playCursor);
+    ok &= draw_cursor(d, s->cursor);
+    ok &= draw_cursor(d, s->playCursor);
     return ok;
 }
 
@@ -267,36 +368,8 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
     VELMCANVAS_RestoreOverlay(canvas);
 
     const bool empty = AUDIOSIGNAL_NumSamples(d->document->signal) <= 0 && (copy->viewFlags & 0x100000u);
-    const DrawHooks &hooks = draw_hooks();
-    switch (mask & ~0x1000u) {
-    case 0: case 0x2: break;
-    case 0x80: case 0x100: case 0x180: ok &= call_hook(hooks.changedRegion, d); break;
-    case 0x4: case 0x6: case 0x42: case 0x200: ok &= VELMDRAW_FullRedrawFromMemory(d); break;
-    case 0x40:
-        ok &= VELMDRAW_FullRedrawFromMemory(d);
-        ok &= call_hook(hooks.regionOnFocus, d, 0, d->columns - 1);
-        break;
-    case 0x4000: ok &= call_hook(hooks.vertScales, d); break;
-    case 0x811: case 0x813:
-        ok &= VELMDRAW_UpdateViewWindow(d);
-        ok &= VELMDRAW_DrawChannelSeparators(d);
-        ok &= VELMDRAW_FullRedrawFromMemory(d);
-        VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
-        ok &= call_hook(hooks.regionOnFocus, d, 0, d->columns - 1);
-        break;
-    default: ok &= full_redraw(d, mask); break;
-    }
-    VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
-    if (empty) {
-        VELMCANVAS_SetAlphaFactor(canvas, 0.5f);
-        VELMCANVAS_SelectColor(canvas, 0);
-        VELMCANVAS_FillRect(canvas, 0, 0, copy->drawWidth, copy->drawHeight, 0);
-        VELMCANVAS_SetAlphaFactor(canvas, 1.0f);
-        mark_dirty(d, 0, 0, copy->drawWidth - 1, copy->drawHeight - 1);
-    } else {
-        ok &= call_hook(hooks.regionShadows, d);
-        ok &= call_hook(hooks.overlays, d, mask);
-    }
+    ok &= dispatch(d, mask, old);
+    ok &= draw_overlay_tail(d, empty);
 
     if (changed) {
         const _VELMRECT &r = d->dirty;
