@@ -244,9 +244,11 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
         mask = VELMSTATE_EvalChanges(d->document, copy, old);
     }
     mask |= copy->changes;
-    // An edit changes the samples under an unchanged view.
+    // An edit changes the samples under an unchanged view; when the newest
+    // change was to the regions, the region layers redraw what it touched.
     const uint64_t change_time = VELMAUDIO_GetChangeTime(d->document);
-    if (change_time != d->drawnChangeTime) mask |= 0x80000000u;
+    const bool regions_changed = change_time == AUDIOSIGNAL_GetTimeStamp(d->document->signal, AUDIOSIGNAL_STAMP_REGIONS);
+    if (change_time != d->drawnChangeTime && !regions_changed) mask |= 0x80000000u;
     d->drawnChangeTime = change_time;
     const bool size_changed = !old || old->drawWidth != copy->drawWidth || old->drawHeight != copy->drawHeight;
     if (!old || !d->laidOut) mask |= kEverything;
