@@ -14,9 +14,10 @@ using namespace velm::view;
 
 namespace {
 
-// Columns kept beyond either end of the display: a region running out of
-// view keeps its rounded ends, borders and shadows out of sight too.
-constexpr double kOffViewColumns = 32.0;
+// A region running out of view keeps its true extent (its text stays
+// centred on the whole region as it scrolls), up to this many columns beyond
+// either end of the display, which keeps coordinates well inside 32 bits.
+constexpr double kOffViewColumns = 1 << 24;
 // Nesting deeper than this is drawn as if it were this deep.
 constexpr int kMaxDepth = 16;
 

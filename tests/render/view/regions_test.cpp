@@ -283,6 +283,27 @@ TEST_F(ChangedRegion, LongerRegion)
     });
 }
 
+TEST_F(RegionView, ScrollingRegionsEqualsAFullRedraw)
+{
+    track_options("words", "SHOWRGNLABEL");
+    add("default", 3000, 9000, "left");
+    add("words", 7000, 15000, "crossing");
+    add("default", 14000, 20000, "right");
+    const uint32_t flags = kView | 0x2000000;
+    // The renderer measures text on the canvas it drew last: the canvases
+    // live as long as the document is drawn.
+    viewtest::Canvas left(kWidth, kHeight), right(kWidth, kHeight), direct(kWidth, kHeight);
+    for (int64_t start : {3100, 1900}) {
+        viewtest::Canvas &scrolled = start > 2500 ? left : right;
+        ASSERT_TRUE(VELMAUDIO_Zoom(doc, 2500, 14500));
+        draw(scrolled, flags);
+        ASSERT_TRUE(VELMAUDIO_Zoom(doc, start, start + 12000));
+        const QImage image = draw(scrolled, flags);
+        VELMSTATE_NotifyChanges(doc, 0);
+        EXPECT_EQ(viewtest::count_differences(image, draw(direct, flags)), 0) << start;
+    }
+}
+
 TEST_F(RegionView, HeldRegionTintsItsColumnsOverTheLanes)
 {
     AUDIOREGION *held = add("words", 8000, 16000);
