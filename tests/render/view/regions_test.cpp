@@ -351,4 +351,39 @@ TEST_F(RegionView, TrackFontFollowsTheTrackSettings)
     EXPECT_GT(track_area(words).height, track_area(0).height);
 }
 
+TEST_F(RegionView, HiddenDefaultTrackShowsItsRegionsOverTheLanesOnly)
+{
+    AUDIOREGION *r = add("default", 6000, 12000);
+    ASSERT_TRUE(VELMAUDIO_HideCustomTrack(doc, "default"));
+    viewtest::Canvas canvas(kWidth, kHeight);
+    const QImage plain = draw(canvas, kPlainView);
+    _VELMRECT rect{};
+    EXPECT_FALSE(VELMAUDIO_GetRegionDrawRect(doc, r, &rect));
+    const QImage over = draw(canvas, kPlainView | 0x2000000);
+    ASSERT_TRUE(VELMAUDIO_GetRegionDrawRect(doc, r, &rect));
+    EXPECT_EQ(rect.top, doc->renderer->lanesArea.top);
+    EXPECT_EQ(rect.height, doc->renderer->lanesArea.height);
+    const int row = rect.top + 5;
+    for (int x = rect.left + 6; x <= rect.right - 6; ++x) EXPECT_NE(over.pixel(x, row), plain.pixel(x, row)) << x;
+    for (int x : {rect.left - 2, rect.right + 2}) EXPECT_EQ(over.pixel(x, row), plain.pixel(x, row)) << x;
+}
+
+TEST(RegionCalls, RefuseMissingArguments)
+{
+    _VELMRECT rect{};
+    VELMCONFIGFONT font{};
+    const VELMREGIONCOPY copy{};
+    EXPECT_EQ(VELMDRAW_UpdateVisibleRegion(nullptr), 0);
+    EXPECT_EQ(VELMDRAW_DrawCustomCanvas(nullptr, 0, 10), 0);
+    EXPECT_EQ(VELMDRAW_DrawVertCustomTracks(nullptr), 0);
+    EXPECT_EQ(VELMDRAW_DrawRegionsAndCues(nullptr, 0, 10), 0);
+    EXPECT_EQ(VELMDRAW_DrawCustomTrackRegions(nullptr, 0, 10), 0);
+    EXPECT_EQ(VELMDRAW_DrawRegionOnFocus(nullptr, 0, 10), 0);
+    EXPECT_EQ(VELMDRAW_UpdateChangedRegion(nullptr, &copy), 0);
+    EXPECT_EQ(VELMDRAW_DrawCustomTrackRegionShadows(nullptr), 0);
+    EXPECT_EQ(VELMDRAW_GetVisibleRegionRect(nullptr, nullptr, &rect), 0);
+    EXPECT_EQ(VELMDRAW_GetCustomTrackFont(nullptr, 0, &font), nullptr);
+    EXPECT_EQ(VELMAUDIO_GetRegionDrawRect(nullptr, nullptr, &rect), 0);
+}
+
 } // namespace
