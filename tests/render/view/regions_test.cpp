@@ -368,6 +368,25 @@ TEST_F(RegionView, HiddenDefaultTrackShowsItsRegionsOverTheLanesOnly)
     for (int x : {rect.left - 2, rect.right + 2}) EXPECT_EQ(over.pixel(x, row), plain.pixel(x, row)) << x;
 }
 
+TEST_F(RegionView, TextMarkedHiddenIsLeftOut)
+{
+    track_options("words", "SHOWRGNLABEL");
+    AUDIOREGION *r = add("words", 4000, 12000, "spoken");
+    viewtest::Canvas canvas(kWidth, kHeight);
+    const QImage shown = draw(canvas, kPlainView);
+    ASSERT_TRUE(VELMAUDIO_SetRegionTextHide(doc, r, 1));
+    VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
+    const QImage hidden = draw(canvas, kPlainView);
+    const _VELMRECT a = rect_of(r);
+    const int row = a.top + a.height / 2;
+    int text_pixels = 0;
+    for (int x = a.left + 8; x <= a.right - 8; ++x) {
+        EXPECT_EQ(hidden.pixel(x, row), hidden.pixel(a.left + 8, row)) << x;
+        if (shown.pixel(x, row) != hidden.pixel(x, row)) ++text_pixels;
+    }
+    EXPECT_GT(text_pixels, 0);
+}
+
 TEST(RegionCalls, RefuseMissingArguments)
 {
     _VELMRECT rect{};
