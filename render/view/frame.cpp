@@ -272,7 +272,11 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
     const DrawHooks &hooks = draw_hooks();
     switch (mask & ~0x1000u) {
     case 0: case 0x2: break;
-    case 0x80: case 0x100: case 0x180: ok &= call_hook(hooks.changedRegion, d); break;
+    case 0x80: case 0x100: case 0x180: {
+        const int redrawn = call_hook(hooks.changedRegion, d);
+        ok &= redrawn < 0 ? full_redraw(d, kEverything) : redrawn;
+        break;
+    }
     case 0x4: case 0x6: case 0x42: case 0x200: ok &= VELMDRAW_FullRedrawFromMemory(d); break;
     case 0x40:
         ok &= VELMDRAW_FullRedrawFromMemory(d);

@@ -2,7 +2,7 @@
 // "default" track's regions over the lanes, and the redraw of the one region
 // whose edges moved.
 #include <algorithm>
-#include <climits>
+#include <vector>
 
 #include "core/document_internal.hpp"
 #include "core/velmaudio.h"
@@ -147,25 +147,15 @@ int VELMDRAW_DrawRegionsAndCues(VELMDRAW d, int first, int last)
 int VELMDRAW_UpdateChangedRegion(VELMDRAW d, const VELMREGIONCOPY *changed)
 {
     if (!d || !d->canvas || !d->state || !d->laidOut || !changed) return 0;
-    if (!changed->region || changed->region != d->state->focusedRegion.region) return 1;
-    const auto *region = static_cast<const AUDIOREGION *>(changed->region);
-    // The columns it covered and the columns it covers now; either may be
-    // none when it moved into or out of the view.
-    int32_t left = INT32_MAX, right = INT32_MIN;
-    if (const RegionEntry *old = find_entry(d, region)) {
-        left = old->area.left;
-        right = old->area.right;
-    }
-    RegionEntry now;
-    if (area_from_region(d, region, VELMAUDIO_FindCustomTrackId(d->document, "default"), &now)) {
-        left = std::min(left, now.area.left);
-        right = std::max(right, now.area.right);
-    }
+    // Besides the focused region, an edge change of any region or the
+    // descendants that followed it may have moved.
+    const std::vector<RegionEntry> now = visible_entries(d);
+    const RegionChange change = changed_regions(d, now);
+    if (change.lanes) return -1;
     const _VELMRECT band = track_band(d);
-    if (right < left || band.height <= 0) return 1;
-    const int first = std::max(left - 1 - d->display.left, 0);
-    const int last = std::min(right + 1 - d->display.left, d->columns - 1);
-    if (last < first) return 1;
+    const int first = std::max(change.left - 1 - d->display.left, 0);
+    const int last = std::min(change.right + 1 - d->display.left, d->columns - 1);
+    if (!change.any() || band.height <= 0 || last < first) return keep_entries(d, now) ? 1 : 0;
 
     VELMCANVAS c = d->canvas;
     VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_MEMORY);
@@ -175,7 +165,7 @@ int VELMDRAW_UpdateChangedRegion(VELMDRAW d, const VELMREGIONCOPY *changed)
     int ok = VELMDRAW_DrawCanvas(d, first, last);
     if (const auto grids = draw_hooks().scaleGrids) ok &= grids(d, first, last);
     VELMCANVAS_ClearDrawArea(c);
-    ok &= VELMDRAW_UpdateVisibleRegion(d);
+    ok &= keep_entries(d, now) ? 1 : 0;
     ok &= VELMDRAW_DrawCustomTrackRegions(d, first, last);
     ok &= VELMCANVAS_MoveBlock2(c, VELMCANVASTARGET_MEMORY, clip.left, clip.top, clip.width, clip.height,
                                 VELMCANVASTARGET_OUTPUT, clip.left, clip.top);

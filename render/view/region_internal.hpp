@@ -3,6 +3,9 @@
 #ifndef VELM_REGION_INTERNAL_HPP
 #define VELM_REGION_INTERNAL_HPP
 
+#include <climits>
+#include <vector>
+
 #include "render/view/drawer_internal.hpp"
 
 namespace velm::view {
@@ -11,6 +14,21 @@ namespace velm::view {
 // area (the lanes' rows for a hidden "default" track).  False when the region
 // lies outside the view or its track is not drawn.
 bool area_from_region(VELMDRAW drawer, const AUDIOREGION *region, int default_track, RegionEntry *entry);
+
+// The regions in view as the list would hold them now, parents before their
+// children; and storing such a list as the drawer's.
+std::vector<RegionEntry> visible_entries(VELMDRAW drawer);
+bool keep_entries(VELMDRAW drawer, const std::vector<RegionEntry> &entries);
+
+// The canvas columns of every region whose place differs between the
+// drawer's list and `now` (moved, resized, come or gone), and where they
+// show: on the tracks, over the lanes.
+struct RegionChange {
+    int32_t left = INT32_MAX, right = INT32_MIN;
+    bool tracks = false, lanes = false;
+    bool any() const { return left <= right; }
+};
+RegionChange changed_regions(const _VELMDRAW *drawer, const std::vector<RegionEntry> &now);
 
 // The listed entry of a region (or of a copy of it), or null.
 const RegionEntry *find_entry(const _VELMDRAW *drawer, const AUDIOREGION *region);

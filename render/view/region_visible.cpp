@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <memory>
+#include <unordered_map>
 #include <vector>
 
 #include "core/document_internal.hpp"
@@ -97,21 +98,16 @@ _VELMRECT track_band(const _VELMDRAW *d)
     return make_rect(d->display.left, top, d->display.width, bottom - top + 1);
 }
 
-} // namespace velm::view
-
-int VELMDRAW_UpdateVisibleRegion(VELMDRAW d)
+std::vector<RegionEntry> visible_entries(VELMDRAW d)
 {
-    if (!d || !d->state || !d->laidOut) return 0;
-    RegionLayer &layer = d->regionLayer;
-    layer.count = 0;
+    std::vector<RegionEntry> entries;
     AUDIOSIGNAL *signal = d->document->signal;
     const int64_t begin = d->state->viewBegin, end = d->state->viewEnd;
     const int count = AUDIOSIGNAL_CountVisibleRegions(signal, begin, end);
-    if (count <= 0) return 1;
+    if (count <= 0) return entries;
     std::vector<AUDIOREGION *> found(static_cast<size_t>(count));
     const int n = std::clamp(AUDIOSIGNAL_GetVisibleRegions(signal, found.data(), count, begin, end), 0, count);
     const int default_track = VELMAUDIO_FindCustomTrackId(d->document, "default");
-    std::vector<RegionEntry> entries;
     entries.reserve(static_cast<size_t>(n));
     for (int i = 0; i < n; ++i) {
         RegionEntry entry;
@@ -122,10 +118,54 @@ int VELMDRAW_UpdateVisibleRegion(VELMDRAW d)
     std::stable_sort(entries.begin(), entries.end(), [](const RegionEntry &a, const RegionEntry &b) {
         return nesting_depth(a.region) < nesting_depth(b.region);
     });
-    if (!reserve_entries(d, static_cast<int>(entries.size()))) return 0;
+    return entries;
+}
+
+bool keep_entries(VELMDRAW d, const std::vector<RegionEntry> &entries)
+{
+    RegionLayer &layer = d->regionLayer;
+    layer.count = 0;
+    if (!reserve_entries(d, static_cast<int>(entries.size()))) return false;
     std::copy(entries.begin(), entries.end(), layer.entries);
     layer.count = static_cast<int32_t>(entries.size());
-    return 1;
+    return true;
+}
+
+RegionChange changed_regions(const _VELMDRAW *d, const std::vector<RegionEntry> &now)
+{
+    RegionChange change;
+    const bool over_lanes = d->state->viewFlags & 0x2000000u;
+    auto add = [&](const RegionEntry &e) {
+        change.left = std::min(change.left, e.area.left);
+        change.right = std::max(change.right, e.area.right);
+        if (e.flags & 0x1u) change.tracks = true;
+        if ((e.flags & 0x2u) && over_lanes) change.lanes = true;
+    };
+    std::unordered_map<const AUDIOREGION *, const RegionEntry *> before;
+    const RegionLayer &layer = d->regionLayer;
+    for (int i = 0; i < layer.count; ++i) before.emplace(layer.entries[i].region, &layer.entries[i]);
+    for (const RegionEntry &e : now) {
+        const auto it = before.find(e.region);
+        if (it != before.end()) {
+            const RegionEntry &old = *it->second;
+            const bool same = old.flags == e.flags && old.area.left == e.area.left && old.area.width == e.area.width &&
+                              old.area.top == e.area.top && old.area.height == e.area.height;
+            if (!same) add(old);
+            before.erase(it);
+            if (same) continue;
+        }
+        add(e);
+    }
+    for (const auto &gone : before) add(*gone.second);
+    return change;
+}
+
+} // namespace velm::view
+
+int VELMDRAW_UpdateVisibleRegion(VELMDRAW d)
+{
+    if (!d || !d->state || !d->laidOut) return 0;
+    return keep_entries(d, visible_entries(d)) ? 1 : 0;
 }
 
 int VELMDRAW_GetVisibleRegionRect(VELMDRAW d, const AUDIOREGION *region, _VELMRECT *out)

@@ -55,6 +55,11 @@ VELM_API int VELMDRAW_DrawVertCustomTracks(VELMDRAW drawer);
 VELM_API int VELMDRAW_DrawRegionsAndCues(VELMDRAW drawer, int first, int last);
 VELM_API int VELMDRAW_DrawCustomTrackRegions(VELMDRAW drawer, int first, int last);
 VELM_API int VELMDRAW_DrawRegionOnFocus(VELMDRAW drawer, int first, int last);
+/* After the focused region (whose snapshot is given) changed its edges:
+ * redraws the tracks' columns of every region whose place changed, into
+ * the memory target and out to the output.  1 when done, 0 on failure, -1
+ * (drawing nothing) when a changed region shows over the lanes: only a full
+ * redraw shows that. */
 VELM_API int VELMDRAW_UpdateChangedRegion(VELMDRAW drawer, const VELMREGIONCOPY *region);
 VELM_API int VELMDRAW_DrawCustomTrackRegionShadows(VELMDRAW drawer);
 /* Canvas rectangle of a drawn region (a copy of a region finds its

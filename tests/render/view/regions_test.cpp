@@ -240,47 +240,68 @@ TEST_F(RegionView, NarrowRegionsAreABarOrOnlyAShadow)
     EXPECT_GT(changed, t.height);
 }
 
-// Moving or resizing the focused region redraws only the tracks' band over
-// its columns; the result is the picture a full redraw gives.
+// Moving or resizing a region redraws only the tracks' band over its
+// columns, unless it shows over the lanes; either way the result is the
+// picture a full redraw gives.
 class ChangedRegion : public RegionView {
 protected:
-    void expect_partial_redraw_matches_full(const std::function<void(AUDIOREGION *)> &change)
+    void SetUp() override
     {
+        RegionView::SetUp();
         track_options("words", "SHOWRGNLABEL");
-        AUDIOREGION *moving = add("words", 8000, 12000, "moving");
-        add("words", 20000, 24000, "still");
-        add("default", 9000, 15000, "below");
-        viewtest::Canvas canvas(kWidth, kHeight);
-        draw(canvas, kView);
+        moving = add("words", 8000, 12000, "moving");
+        still = add("words", 20000, 24000, "still");
+        below = add("default", 9000, 15000, "below");
         ASSERT_TRUE(VELMAUDIO_SetFocusOnRegion(doc, moving));
-        const QImage before = draw(canvas, kView);
-        const _VELMRECT old_rect = rect_of(moving);
-
-        change(moving);
-        _VELMRECT dirty{};
-        const QImage after = draw(canvas, kView, &dirty);
-        EXPECT_NE(rect_of(moving).left + rect_of(moving).width, old_rect.left + old_rect.width);
-        EXPECT_GT(viewtest::count_differences(before, after), 0);
-        // Only the tracks and the shadows around them were touched.
-        EXPECT_GE(dirty.top, track_area(0).top - 7);
-        EXPECT_GT(dirty.height, 0);
-
-        viewtest::Canvas fresh(kWidth, kHeight);
-        VELMSTATE_NotifyChanges(doc, 0); // a fresh canvas is drawn only with a change pending
-        EXPECT_EQ(viewtest::count_differences(after, draw(fresh, kView)), 0);
     }
+    // The output pixels the frame after the change touched.
+    _VELMRECT redraw_after(uint32_t flags, const std::function<void()> &change)
+    {
+        viewtest::Canvas canvas(kWidth, kHeight), fresh(kWidth, kHeight);
+        draw(canvas, flags);
+        const QImage before = draw(canvas, flags);
+        change();
+        _VELMRECT dirty{};
+        const QImage after = draw(canvas, flags, &dirty);
+        EXPECT_GT(viewtest::count_differences(before, after), 0);
+        VELMSTATE_NotifyChanges(doc, 0); // a fresh canvas is drawn only with a change pending
+        EXPECT_EQ(viewtest::count_differences(after, draw(fresh, flags)), 0);
+        return dirty;
+    }
+    // Only the tracks and the shadows around them.
+    void expect_tracks_only(const _VELMRECT &dirty)
+    {
+        EXPECT_GT(dirty.height, 0);
+        EXPECT_GE(dirty.top, track_area(0).top - 7);
+    }
+
+    AUDIOREGION *moving = nullptr, *still = nullptr, *below = nullptr;
 };
 
-TEST_F(ChangedRegion, OffsetRegion)
+TEST_F(ChangedRegion, OffsetFocusedRegion)
 {
-    expect_partial_redraw_matches_full([&](AUDIOREGION *) { ASSERT_TRUE(VELMAUDIO_OffsetRegions(doc, 2500)); });
+    const int64_t end = AUDIOREGION_EndSample(moving);
+    expect_tracks_only(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_OffsetRegions(doc, 2500)); }));
+    EXPECT_EQ(AUDIOREGION_EndSample(moving), end + 2500);
 }
 
-TEST_F(ChangedRegion, LongerRegion)
+TEST_F(ChangedRegion, LongerFocusedRegion)
 {
-    expect_partial_redraw_matches_full([&](AUDIOREGION *r) {
-        ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, r, 16000.0 / kRate, 0));
-    });
+    expect_tracks_only(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, moving, 1.0, 0)); }));
+}
+
+TEST_F(ChangedRegion, EdgeOfAnotherRegion)
+{
+    expect_tracks_only(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionBegin(doc, still, 1.0, 0)); }));
+    EXPECT_EQ(AUDIOREGION_BeginSample(still), kRate);
+}
+
+TEST_F(ChangedRegion, RegionOverTheLanesRedrawsEverything)
+{
+    const _VELMRECT dirty =
+        redraw_after(kView | 0x2000000, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, below, 1.5, 0)); });
+    EXPECT_EQ(dirty.top, 0);
+    EXPECT_EQ(dirty.height, kHeight);
 }
 
 TEST_F(RegionView, ScrollingRegionsEqualsAFullRedraw)
