@@ -7,6 +7,7 @@
 #include "control/velmcontrol.h"
 #include "core/document_internal.hpp"
 #include "render/view/drawer_internal.hpp"
+#include "render/view/velmoverlays.h"
 
 using namespace velm::view;
 
@@ -190,9 +191,8 @@ int32_t VELMDRAW_CustomTrackHeight(VELMDRAW drawer, int track)
 {
     if (!drawer || !drawer->canvas || !drawer->state || track < 0 || track >= VELM_MAX_CUSTOM_TRACKS) return 0;
     const VELMTRACKDISPLAY &t = drawer->state->tracks[track];
-    const VELMCONFIGFONT &source = t.options & 0x10000 ? drawer->config.phoneticTextFont : drawer->config.regionTextFont;
-    _VELMCANVASFONT font = canvas_font(source);
-    if (t.fontSize > 0.0f) font.size = t.fontSize;
+    VELMCONFIGFONT config;
+    const _VELMCANVASFONT font = canvas_font(*VELMDRAW_GetCustomTrackFont(drawer, track, &config));
     VELMCANVAS_SelectFont(drawer->canvas, &font);
     const int text = VELMCANVAS_TextHeight(drawer->canvas, "\xE5pple");
     return std::max(static_cast<int32_t>((0.5 + t.lineCount) * text), t.minimumHeight);

@@ -130,8 +130,8 @@ struct DrawHooks {
     // trackScales paints the custom tracks' scale areas and trackCanvas their
     // backgrounds (memory target); regions draws the regions of columns
     // first .. last into the memory target; regionOnFocus and regionShadows
-    // draw on the output target; changedRegion redraws the one region that
-    // moved or changed length.
+    // draw on the output target; changedRegion redraws the regions that
+    // moved or changed length, or answers -1 when only a full redraw can.
     int (*visibleRegions)(VELMDRAW drawer) = nullptr;
     int (*trackScales)(VELMDRAW drawer) = nullptr;
     int (*trackCanvas)(VELMDRAW drawer, int first, int last) = nullptr;

@@ -169,7 +169,17 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
         ok &= call_hook(hooks.regionOnFocus, d, 0, last);
         ok &= draw_selection_overlays(d);
         break;
-    case 0x80: case 0x100: case 0x180: ok &= call_hook(hooks.changedRegion, d); break;
+    case 0x80: case 0x100: case 0x180: {
+        // -1: the region also shows over the lanes, which only a full redraw repaints.
+        const int redrawn = call_hook(hooks.changedRegion, d);
+        if (redrawn >= 0) {
+            ok &= redrawn;
+            break;
+        }
+        ok &= full_redraw(d, kEverything);
+        ok &= draw_selection_overlays(d);
+        break;
+    }
     case 0x200:
         ok &= VELMDRAW_FullRedrawFromMemory(d);
         ok &= draw_selection_list(d, d->state, 0, last);
@@ -345,9 +355,11 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
         mask = VELMSTATE_EvalChanges(d->document, copy, old);
     }
     mask |= copy->changes;
-    // An edit changes the samples under an unchanged view.
+    // An edit changes the samples under an unchanged view; when the newest
+    // change was to the regions, the region layers redraw what it touched.
     const uint64_t change_time = VELMAUDIO_GetChangeTime(d->document);
-    if (change_time != d->drawnChangeTime) mask |= 0x80000000u;
+    const bool regions_changed = change_time == AUDIOSIGNAL_GetTimeStamp(d->document->signal, AUDIOSIGNAL_STAMP_REGIONS);
+    if (change_time != d->drawnChangeTime && !regions_changed) mask |= 0x80000000u;
     d->drawnChangeTime = change_time;
     const bool size_changed = !old || old->drawWidth != copy->drawWidth || old->drawHeight != copy->drawHeight;
     if (!old || !d->laidOut) mask |= kEverything;

@@ -9,7 +9,8 @@
 
 namespace velm::view {
 
-// One region inside the view window: its columns on its track's area.
+// One region inside the view window: its columns on its track's area (the
+// lanes' rows for a hidden "default" track), in canvas coordinates.
 struct RegionEntry {
     _VELMRECT area{};
     double begin = 0.0, end = 0.0;  // samples
@@ -17,6 +18,9 @@ struct RegionEntry {
     AUDIOREGION *region = nullptr;
 };
 
+// The entries in drawing order: by nesting depth (outermost first), each
+// depth in time order; a hit test walking backwards meets the innermost
+// region first.
 struct RegionLayer {
     RegionEntry *entries = nullptr;  // in the drawer's pool
     int32_t capacity = 0;

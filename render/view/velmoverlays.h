@@ -55,17 +55,33 @@ VELM_API int VELMDRAW_DrawVertCustomTracks(VELMDRAW drawer);
 VELM_API int VELMDRAW_DrawRegionsAndCues(VELMDRAW drawer, int first, int last);
 VELM_API int VELMDRAW_DrawCustomTrackRegions(VELMDRAW drawer, int first, int last);
 VELM_API int VELMDRAW_DrawRegionOnFocus(VELMDRAW drawer, int first, int last);
+/* After the focused region (whose snapshot is given) changed its edges:
+ * redraws the tracks' columns of every region whose place changed, into
+ * the memory target and out to the output.  1 when done, 0 on failure, -1
+ * (drawing nothing) when a changed region shows over the lanes: only a full
+ * redraw shows that. */
 VELM_API int VELMDRAW_UpdateChangedRegion(VELMDRAW drawer, const VELMREGIONCOPY *region);
 VELM_API int VELMDRAW_DrawCustomTrackRegionShadows(VELMDRAW drawer);
-/* Canvas rectangle of a drawn region; 0 when it is not in view. */
+/* Canvas rectangle of a drawn region (a copy of a region finds its
+ * original), cut to the display area; 0 when it is not drawn. */
 VELM_API int VELMDRAW_GetVisibleRegionRect(VELMDRAW drawer, const AUDIOREGION *region, _VELMRECT *out);
+/* Fills out with the font of custom track 0 .. 7 (by track number): the
+ * configured region text font, or the phonetic text font for a track with
+ * option 0x10000, at the track's font size, colour and inactive colour.
+ * Returns out, or null for a bad argument. */
+VELM_API const VELMCONFIGFONT *VELMDRAW_GetCustomTrackFont(VELMDRAW drawer, int track, VELMCONFIGFONT *out);
 
 /* ---- Document entry points ---------------------------------------------- */
 
 /* The renderer's selection rectangle; an all-zero rectangle (and 0) without
  * a renderer. */
 VELM_API int VELMAUDIO_GetSelectionRect(_VELMRECT *out, VELMAUDIO doc);
+/* Where the renderer drew a region (VELMDRAW_GetVisibleRegionRect); 0
+ * before the first draw. */
 VELM_API int VELMAUDIO_GetRegionDrawRect(VELMAUDIO doc, const AUDIOREGION *region, _VELMRECT *out);
+/* The renderer's font of a custom track (VELMDRAW_GetCustomTrackFont); null
+ * before the first draw. */
+VELM_API const VELMCONFIGFONT *VELMAUDIO_GetCustomTrackFont(VELMAUDIO doc, int track, VELMCONFIGFONT *out);
 
 VELM_EXTERN_C_END
 
