@@ -52,6 +52,7 @@ typedef struct _audio_signal_pipe AUDIOSIGNAL_PIPE;
 #define AUDIOSIGNAL_STAMP_REGIONS 1 /* grows with every change of the regions */
 #define AUDIOSIGNAL_STAMP_FILE    2 /* modification time of the file at the last open or save,
                                        nanoseconds since the epoch; 0 without a file */
+#define AUDIOSIGNAL_STAMP_SAMPLES 3 /* grows with every change of samples or format */
 
 /* AUDIOSIGNAL_NotifyChange kinds. */
 #define AUDIOSIGNAL_CHANGED_REGIONS 0x1

@@ -241,7 +241,8 @@ struct _VELMDRAW {
     VELMDRAWCONFIG config{};
     BLMUTEX      lock = nullptr;
     uint8_t      laidOut = 0;
-    uint64_t     drawnChangeTime = 0;   // the document's change stamp of the last frame
+    uint64_t     drawnChangeTime = 0;
+    uint64_t     drawnSamplesTime = 0;  // the signal's samples stamp of the last frame   // the document's change stamp of the last frame
     velm::view::HorzScale horzTicks;
     velm::view::OverlayLayout overlay;
     velm::view::RegionLayer regionLayer;

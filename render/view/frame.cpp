@@ -355,12 +355,17 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
         mask = VELMSTATE_EvalChanges(d->document, copy, old);
     }
     mask |= copy->changes;
-    // An edit changes the samples under an unchanged view; when the newest
-    // change was to the regions, the region layers redraw what it touched.
+    // An edit changes the samples under an unchanged view; when only the
+    // regions changed since the last frame, the region layers redraw what
+    // the change touched.
+    AUDIOSIGNAL *signal = d->document->signal;
     const uint64_t change_time = VELMAUDIO_GetChangeTime(d->document);
-    const bool regions_changed = change_time == AUDIOSIGNAL_GetTimeStamp(d->document->signal, AUDIOSIGNAL_STAMP_REGIONS);
-    if (change_time != d->drawnChangeTime && !regions_changed) mask |= 0x80000000u;
+    const uint64_t samples_time = AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_SAMPLES);
+    const bool regions_only = change_time == AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_REGIONS) &&
+                              samples_time == d->drawnSamplesTime;
+    if (change_time != d->drawnChangeTime && !regions_only) mask |= 0x80000000u;
     d->drawnChangeTime = change_time;
+    d->drawnSamplesTime = samples_time;
     const bool size_changed = !old || old->drawWidth != copy->drawWidth || old->drawHeight != copy->drawHeight;
     if (!old || !d->laidOut) mask |= kEverything;
 

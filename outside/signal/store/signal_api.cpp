@@ -110,6 +110,7 @@ AUDIOSIGNAL *AUDIOSIGNAL_DuplicateEx(AUDIOSIGNAL *signal, int flags)
     copy->stamp = signal->stamp;
     copy->reset_stamp = signal->reset_stamp;
     copy->regions_stamp = signal->regions_stamp;
+    copy->samples_stamp = signal->samples_stamp;
     copy->file_time = signal->file_time;
     copy->hash_stamp = signal->hash_stamp;
     copy->hash = signal->hash;
@@ -213,7 +214,7 @@ int AUDIOSIGNAL_SetSampleRate(AUDIOSIGNAL *signal, int sample_rate)
     std::lock_guard<std::mutex> guard(signal->lock);
     if (signal->format.sampleRate != sample_rate) {
         signal->format.sampleRate = sample_rate;
-        signal->stamp = next_stamp();
+        signal->stamp = signal->samples_stamp = next_stamp();
     }
     return 1;
 }
@@ -225,6 +226,7 @@ uint64_t AUDIOSIGNAL_GetTimeStamp(const AUDIOSIGNAL *signal, int kind)
     switch (kind) {
     case AUDIOSIGNAL_STAMP_CHANGES: return signal->stamp;
     case AUDIOSIGNAL_STAMP_REGIONS: return signal->regions_stamp;
+    case AUDIOSIGNAL_STAMP_SAMPLES: return signal->samples_stamp;
     case AUDIOSIGNAL_STAMP_FILE: return signal->file_time;
     default: return 0;
     }
@@ -251,6 +253,7 @@ int AUDIOSIGNAL_NotifyChange(AUDIOSIGNAL *signal, int what)
     std::lock_guard<std::mutex> guard(signal->lock);
     signal->stamp = next_stamp();
     if (what & AUDIOSIGNAL_CHANGED_REGIONS) signal->regions_stamp = signal->stamp;
+    if (what & AUDIOSIGNAL_CHANGED_SAMPLES) signal->samples_stamp = signal->stamp;
     return 1;
 }
 

@@ -104,7 +104,7 @@ void install_segments(_audio_signal &signal, const std::vector<SegmentsPtr> &seg
             retired.push_back(signal.lists[c]);
             signal.lists[c] = adopt_list(segments[c]);
         }
-        if (samples_changed) signal.stamp = next_stamp();
+        if (samples_changed) signal.stamp = signal.samples_stamp = next_stamp();
     }
     for (_audio_blocks_list *list : retired) retire_list(list);
 }
@@ -135,7 +135,7 @@ _audio_signal *create_signal(const AUDIO_FORMAT &format)
     signal->active_mask = all_channels_mask(format.numChannels);
     signal->stamp = next_stamp();
     signal->reset_stamp = signal->stamp;
-    signal->regions_stamp = signal->stamp;
+    signal->regions_stamp = signal->samples_stamp = signal->stamp;
     return signal;
 }
 

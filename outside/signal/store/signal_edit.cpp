@@ -312,7 +312,7 @@ int AUDIOSIGNAL_SwapChannels(AUDIOSIGNAL *signal)
     std::unique_lock<std::shared_mutex> writer(signal->access);
     std::lock_guard<std::mutex> guard(signal->lock);
     std::swap(signal->lists[0], signal->lists[1]);
-    signal->stamp = next_stamp();
+    signal->stamp = signal->samples_stamp = next_stamp();
     return 1;
 }
 

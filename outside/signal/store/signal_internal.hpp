@@ -52,6 +52,7 @@ struct _audio_signal final : velmsig::RegionHost {
     uint64_t stamp = 0;          // change stamp
     uint64_t reset_stamp = 0;    // stamp at the last ResetChanges
     uint64_t regions_stamp = 0;
+    uint64_t samples_stamp = 0;  // stamp of the last change of samples or format
     uint64_t file_time = 0;      // nanoseconds since the epoch
     uint64_t hash_stamp = 0;     // stamp the cached hash belongs to (0: none)
     AUDIOSIGNAL_HASH hash{};

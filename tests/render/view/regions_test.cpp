@@ -10,6 +10,7 @@
 #include "core/document_internal.hpp"
 #include "core/velmnavigation.h"
 #include "edit/velmcustomtrack.h"
+#include "edit/velmedit.h"
 #include "edit/velmregion.h"
 #include "render/view/drawer_internal.hpp"
 #include "render/view/velmoverlays.h"
@@ -296,6 +297,18 @@ TEST_F(ChangedRegion, EdgeOfAnotherRegion)
 {
     expect_tracks_only(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionBegin(doc, still, 1.0, 0)); }));
     EXPECT_EQ(AUDIOREGION_BeginSample(still), kRate);
+}
+
+// A change of the samples that asked for no redraw of its own, then a region
+// change: the frame must not take the regions-only path.
+TEST_F(ChangedRegion, SamplesChangedJustBeforeAreRedrawnToo)
+{
+    const _VELMRECT dirty = redraw_after(kView, [&] {
+        ASSERT_TRUE(VELMAUDIO_SetSampleRate(doc, 2 * kRate, nullptr));
+        ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, still, 2.0, 0));
+    });
+    EXPECT_EQ(dirty.top, 0);
+    EXPECT_EQ(dirty.height, kHeight);
 }
 
 TEST_F(ChangedRegion, RegionOverTheLanesRedrawsEverything)
