@@ -78,11 +78,29 @@ bool is_sound_database(sqlite3 *db)
     return true;
 }
 
+// Readers and the writer no longer block each other; with the write-ahead
+// log, a crash may lose the last records but never damages the file.  The
+// switch needs the file to itself and SQLite does not wait for it (its busy
+// handler is not called there), so a second process opening a new catalogue
+// at the same moment retries for as long as it would wait for a write.
+bool use_write_ahead_log(sqlite3 *db)
+{
+    constexpr int RETRY_MS = 5;
+    const char *sql = "PRAGMA journal_mode=WAL;";
+    for (int waited = 0;; waited += RETRY_MS) {
+        const int rc = sqlite3_exec(db, sql, nullptr, nullptr, nullptr);
+        if (rc == SQLITE_OK) return true;
+        if ((rc != SQLITE_BUSY && rc != SQLITE_LOCKED) || waited >= BUSY_TIMEOUT_MS) {
+            BLDEBUG_Error(-1, "(VELMDB)_QueryDB: Error (%s) executing query (%s)", sqlite3_errmsg(db), sql);
+            return false;
+        }
+        sqlite3_sleep(RETRY_MS);
+    }
+}
+
 bool create_schema(sqlite3 *db)
 {
-    // Readers and the writer no longer block each other; with the write-ahead
-    // log, a crash may lose the last records but never damages the file.
-    if (!execute(db, "PRAGMA journal_mode=WAL;") || !execute(db, "PRAGMA synchronous=NORMAL;")) return false;
+    if (!use_write_ahead_log(db) || !execute(db, "PRAGMA synchronous=NORMAL;")) return false;
     for (const char *step : SCHEMA_STEPS) {
         if (!execute(db, step)) {
             sqlite3_exec(db, "ROLLBACK;", nullptr, nullptr, nullptr);
