@@ -35,6 +35,11 @@ Result CallWithoutData(VELMCANVAS canvas, Result failure, Args... args)
 // it even.  False when the canvas size is unknown or nothing is left.
 bool ConstrainRect(VELMCANVAS canvas, int &x, int &y, int &width, int &height, int &corner);
 
+// Called with every canvas the host destroys, before it goes, so that the
+// renderers drawing on it forget it.  One listener; null removes it.
+using DestroyListener = void (*)(VELMCANVAS canvas);
+void SetDestroyListener(DestroyListener listener);
+
 } // namespace velm::canvas
 
 #endif // VELM_CANVAS_INTERNAL_H

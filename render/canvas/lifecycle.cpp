@@ -6,6 +6,7 @@
 #include "render/canvas/qt/qtcanvas_internal.h"
 
 #include <algorithm>
+#include <atomic>
 #include <new>
 
 using velm::canvas::Call;
@@ -16,7 +17,14 @@ namespace {
 // Canvases are never shorter than this: the view's fixed strips need it.
 constexpr int kMinimumHeight = 80;
 
+std::atomic<velm::canvas::DestroyListener> destroy_listener{nullptr};
+
 } // namespace
+
+void velm::canvas::SetDestroyListener(DestroyListener listener)
+{
+    destroy_listener = listener;
+}
 
 VELMCANVAS VELMCANVAS_CreateCanvas(const _VELMCANVASOPS *ops, void *native, int width, int height)
 {
@@ -45,6 +53,7 @@ VELMCANVASIMAGE VELMCANVAS_LoadImageQT(const void *bytes, int64_t length)
 int VELMCANVAS_DestroyCanvas(VELMCANVAS canvas)
 {
     if (!canvas) return 0;
+    if (const velm::canvas::DestroyListener listener = destroy_listener) listener(canvas);
     Call<&Ops::DestroyCanvas>(canvas, 0);
     delete canvas;
     return 1;

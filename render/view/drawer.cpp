@@ -64,19 +64,21 @@ VELMDRAW VELMDRAW_Create(VELMAUDIO doc)
     drawer->channels = std::min(AUDIOSIGNAL_NumChannels(doc->signal), VELMDRAW_MAX_CHANNELS);
     VELMCONFIG_InitDrawConfig(&drawer->config);
     VELMCONTROL_Reset(drawer);
+    register_drawer(drawer);
     return drawer;
 }
 
 int VELMDRAW_Destroy(VELMDRAW drawer)
 {
     if (!drawer) return 0;
+    unregister_drawer(drawer);
     VELMCONTROL_Stop(drawer);
     join_workers(drawer);
     for (Lane &lane : drawer->lanes) {
         destroy_wave_data(drawer->pool, lane.wave);
         destroy_spectral_data(lane.spectral);
     }
-    // The canvas belongs to the host and may already be gone: not touched.
+    // The canvas belongs to the host: not touched.
     if (drawer->state) VELMSTATE_Destroy(drawer->state);
     MutexDestroy(drawer->lock);
     BLMEM_DisposeMemDescr(drawer->pool);

@@ -166,6 +166,11 @@ struct HorzScale {
 // length in samples for the frame kinds.
 int64_t horz_scale_step(int kind, double rate, double columns, double view_length, double min_spacing);
 
+// The registry of live drawers; a canvas the host destroys is forgotten by
+// each of them.
+void register_drawer(VELMDRAW drawer);
+void unregister_drawer(VELMDRAW drawer);
+
 // Widens the dirty rectangle by the given output pixels.
 void mark_dirty(VELMDRAW drawer, int32_t left, int32_t top, int32_t right, int32_t bottom);
 

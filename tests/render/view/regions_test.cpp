@@ -368,6 +368,22 @@ TEST_F(RegionView, HeldRegionTintsItsColumnsOverTheLanes)
     EXPECT_EQ(viewtest::count_differences(draw(canvas, kView), resting), 0);
 }
 
+// Track heights are measured on the canvas of the last frame; once the host
+// destroys that canvas, they are not measured at all instead of on freed memory.
+TEST_F(RegionView, TrackHeightsAreNotMeasuredOnADestroyedCanvas)
+{
+    {
+        viewtest::Canvas canvas(kWidth, kHeight);
+        draw(canvas, kView);
+        EXPECT_GT(VELMDRAW_CustomTrackHeight(doc->renderer, words), 0);
+    }
+    EXPECT_EQ(VELMDRAW_CustomTrackHeight(doc->renderer, words), 0);
+    EXPECT_TRUE(VELMAUDIO_SetDrawProperty(doc, 1, kHeight + 40));
+    viewtest::Canvas again(kWidth, kHeight + 40);
+    draw(again, kView);
+    EXPECT_GT(VELMDRAW_CustomTrackHeight(doc->renderer, words), 0);
+}
+
 TEST_F(RegionView, TrackFontFollowsTheTrackSettings)
 {
     VELMCONFIGFONT font{};
