@@ -1,7 +1,8 @@
 // Drawing a one-hour stereo document offscreen: the whole hour at 2000
 // columns (display data computed from the signal's summaries), a scroll by a
-// tenth of a ten-minute window, a zoom step, and the whole hour with
-// spectrogram lanes.
+// tenth of a ten-minute window, a zoom step, the whole hour with spectrogram
+// lanes, and the frames that only move overlays: the cursor, and the end of
+// a selection being dragged.
 //
 //   bench_render_waveform     (run with QT_QPA_PLATFORM=offscreen)
 //
@@ -19,6 +20,7 @@
 #include "core/velmaudio.h"
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
+#include "edit/velmselection.h"
 #include "render/view/velmdraw.h"
 
 namespace {
@@ -142,11 +144,43 @@ void BM_ZoomStep(benchmark::State &state)
     }
 }
 
+// The cursor stepping by a column over the whole hour: only overlays change.
+void BM_CursorMove(benchmark::State &state)
+{
+    Session s(0x3, 1080);
+    s.draw();
+    const int64_t column = kFrames / kColumns;
+    int64_t at = column;
+    for (auto _ : state) {
+        at = at + column < kFrames ? at + column : column;
+        VELMAUDIO_SetCursorPosition(s.doc, at);
+        if (!s.draw()) state.SkipWithError("draw failed");
+    }
+}
+
+// The end of a selection being dragged across the hour, a few columns a frame:
+// only the columns it gains or gives back are painted.
+void BM_SelectingDrag(benchmark::State &state)
+{
+    Session s(0x3, 1080);
+    s.draw();
+    const int64_t step = 3 * (kFrames / kColumns);
+    const int64_t anchor = kFrames / 4;
+    int64_t end = anchor;
+    for (auto _ : state) {
+        end = end + step < kFrames ? end + step : anchor;
+        VELMAUDIO_UpdateSelecting(s.doc, anchor, end);
+        if (!s.draw()) state.SkipWithError("draw failed");
+    }
+}
+
 } // namespace
 
 BENCHMARK(BM_WholeHourWaveform)->Unit(benchmark::kMillisecond)->Iterations(20);
 BENCHMARK(BM_ScrollTenth)->Unit(benchmark::kMillisecond)->Iterations(40);
 BENCHMARK(BM_ZoomStep)->Unit(benchmark::kMillisecond)->Iterations(20);
 BENCHMARK(BM_WholeHourSpectrogram)->Unit(benchmark::kMillisecond)->Iterations(10);
+BENCHMARK(BM_CursorMove)->Unit(benchmark::kMillisecond)->Iterations(200);
+BENCHMARK(BM_SelectingDrag)->Unit(benchmark::kMillisecond)->Iterations(200);
 
 BENCHMARK_MAIN();
