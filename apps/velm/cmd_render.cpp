@@ -8,11 +8,16 @@
 #include <cstring>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "apps/velm/tool.hpp"
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
+#include "core/velmqueries.h"
+#include "core/velmtimeconv.h"
+#include "edit/velmregion.h"
+#include "edit/velmselection.h"
 #include "outside/base/blbase.h"
 #include "render/canvas/velmcanvas.h"
 #include "render/view/velmdraw.h"
@@ -21,7 +26,16 @@ namespace {
 
 const char kUsage[] =
     "usage: velm render [FILE] -o OUT.png [--size WxH] [--lanes waveform|spectrogram|both]\n"
-    "                   [--from SECONDS] [--to SECONDS] [--set libvelm.KEY=VALUE ...]\n";
+    "                   [--from SECONDS] [--to SECONDS] [--select FROM:TO ...] [--cursor SECONDS]\n"
+    "                   [--regions FILE] [--horz-scale KIND] [--vert-scale KIND] [--spec-scale KIND]\n"
+    "                   [--set libvelm.KEY=VALUE ...] [--verbose]\n"
+    "  --select FROM:TO   select FROM .. TO seconds; repeat to select more ranges\n"
+    "  --cursor SECONDS   put the edit cursor there\n"
+    "  --regions FILE     draw the regions of FILE (label text, region file or WAV cues)\n"
+    "  --horz-scale KIND  sample, time, frame, sample_view, time_view or frame_view\n"
+    "  --vert-scale KIND  sample, db, percentual or normalized\n"
+    "  --spec-scale KIND  hz or mels\n"
+    "  --verbose          say on standard error what the document holds before drawing\n";
 
 // Three pixmaps of this size are held at once, so the bound keeps a
 // mistyped size from asking for gigabytes.
@@ -38,7 +52,18 @@ struct RenderArgs {
     double from = -1.0;
     double to = -1.0;
     std::vector<const char *> settings;
+    std::vector<const char *> selections;  // checked "FROM:TO" texts
+    const char *regions = nullptr;
+    double cursor = -1.0;
+    // (draw property, kind) pairs, set in the order given.
+    std::vector<std::pair<int, int>> scales;
+    bool verbose = false;
 };
+
+// Draw property numbers of the scale kinds.
+constexpr int kVertScaleProperty = 3;
+constexpr int kSpecScaleProperty = 4;
+constexpr int kHorzScaleProperty = 5;
 
 bool parse_size(const char *text, RenderArgs *args)
 {
@@ -74,11 +99,32 @@ bool is_setting(const char *text)
     return std::strncmp(text, prefix, n) == 0 && equals && equals > text + n;
 }
 
+// A scale kind named as the configuration names it; false for an unknown name.
+bool parse_scale(int (*decode)(const char *, int), int property, const char *text, RenderArgs *args)
+{
+    const int kind = decode(text, -1);
+    if (kind < 0) return false;
+    args->scales.emplace_back(property, kind);
+    return true;
+}
+
+bool add_selection(const char *text, RenderArgs *args)
+{
+    double from = 0, to = 0;
+    if (!velmtool::parse_range(text, &from, &to)) return false;
+    args->selections.push_back(text);
+    return true;
+}
+
 velmtool::Took take(RenderArgs *args, const char *option, const char *value)
 {
     using velmtool::Took;
     using velmtool::value_if;
     if (option[0] != '-') return velmtool::word_into(&args->file, option);
+    if (std::strcmp(option, "--verbose") == 0 || std::strcmp(option, "-v") == 0) {
+        args->verbose = true;
+        return Took::Alone;
+    }
     if (!value) return Took::Nothing;
     if (std::strcmp(option, "-o") == 0) {
         args->out = value;
@@ -88,6 +134,18 @@ velmtool::Took take(RenderArgs *args, const char *option, const char *value)
     if (std::strcmp(option, "--lanes") == 0) return value_if(parse_lanes(value, &args->lanes));
     if (std::strcmp(option, "--from") == 0) return value_if(velmtool::parse_seconds(value, &args->from));
     if (std::strcmp(option, "--to") == 0) return value_if(velmtool::parse_seconds(value, &args->to));
+    if (std::strcmp(option, "--select") == 0) return value_if(add_selection(value, args));
+    if (std::strcmp(option, "--cursor") == 0) return value_if(velmtool::parse_seconds(value, &args->cursor));
+    if (std::strcmp(option, "--regions") == 0) {
+        args->regions = value;
+        return value_if(*value != '\0');
+    }
+    if (std::strcmp(option, "--horz-scale") == 0)
+        return value_if(parse_scale(VELMCONFIG_DecodeHorzScaleKind, kHorzScaleProperty, value, args));
+    if (std::strcmp(option, "--vert-scale") == 0)
+        return value_if(parse_scale(VELMCONFIG_DecodeVertScaleKind, kVertScaleProperty, value, args));
+    if (std::strcmp(option, "--spec-scale") == 0)
+        return value_if(parse_scale(VELMCONFIG_DecodeSpecScaleKind, kSpecScaleProperty, value, args));
     if (std::strcmp(option, "--set") == 0) {
         args->settings.push_back(value);
         return value_if(is_setting(value));
@@ -116,6 +174,44 @@ bool save_png(const QImage &image, const char *path)
     return file.open(QIODevice::WriteOnly) && image.save(&file, "PNG") && file.commit();
 }
 
+// Puts the regions, selections, cursor and scale kinds into the document;
+// false after a message when one of them does not fit the sound.
+bool mark_up(VELMAUDIO doc, const RenderArgs &args)
+{
+    if (args.regions && !VELMAUDIO_ReadRegions(doc, args.regions, "AUTO")) {
+        std::fprintf(stderr, "velm: cannot read the regions in '%s': %s\n", args.regions,
+                     velmtool::why(args.regions, false, AUDIOSIGNAL_GetLastError()).c_str());
+        return false;
+    }
+    for (const char *text : args.selections) {
+        double from = 0, to = 0;
+        int64_t begin = 0, end = 0;
+        velmtool::parse_range(text, &from, &to);
+        if (!velmtool::sample_range(doc, from, to, &begin, &end) || !VELMAUDIO_AddSelection(doc, begin, end)) {
+            std::fprintf(stderr, "velm: the selection %s holds no samples\n", text);
+            return false;
+        }
+    }
+    if (args.cursor >= 0) {
+        const int64_t sample = VELMAUDIO_TimeToSample(doc, args.cursor);
+        if (sample > VELMAUDIO_NumSamples(doc)) {
+            std::fprintf(stderr, "velm: the cursor at %g s is past the end of the sound\n", args.cursor);
+            return false;
+        }
+        // False only when the cursor is there already.
+        VELMAUDIO_SetCursorPosition(doc, sample);
+    }
+    for (const auto &[property, kind] : args.scales)
+        if (!VELMAUDIO_SetDrawProperty(doc, property, kind)) {
+            std::fprintf(stderr, "velm: cannot set the scale kind\n");
+            return false;
+        }
+    if (args.verbose)
+        std::fprintf(stderr, "velm: %d regions, %d selections\n",
+                     VELMAUDIO_CountVisibleRegions(doc, 0, 0, 0, 0, nullptr), VELMAUDIO_SelectionChunkCount(doc));
+    return true;
+}
+
 // Opens the sound, sets up its view and draws it; needs the application.
 int render(const RenderArgs &args)
 {
@@ -130,6 +226,7 @@ int render(const RenderArgs &args)
             return 1;
         }
     }
+    if (!mark_up(doc.get(), args)) return 1;
     std::unique_ptr<_VELMCANVAS, DestroyCanvas> canvas(VELMCANVAS_CreateCanvasQT(nullptr, args.width, args.height));
     if (!canvas || !VELMCANVAS_ResizeCanvas(canvas.get(), args.width, args.height)) {
         std::fprintf(stderr, "velm: cannot make a %dx%d canvas\n", args.width, args.height);
@@ -146,7 +243,7 @@ int render(const RenderArgs &args)
     // The output pixmap may be larger than the canvas; keep the canvas's part.
     const auto *pixmap = static_cast<const QPixmap *>(VELMCANVAS_GetOutputHandle(canvas.get()));
     if (!pixmap || !save_png(pixmap->toImage().copy(0, 0, args.width, args.height), args.out)) {
-        std::fprintf(stderr, "velm: cannot write '%s'\n", args.out);
+        std::fprintf(stderr, "velm: cannot write '%s': %s\n", args.out, velmtool::why(args.out, true, AUDIO_ERROR_NONE).c_str());
         return 1;
     }
     return 0;
