@@ -86,6 +86,7 @@ TEST(VelmTool, RenderDrawsTheDemoSoundWithoutADisplay)
     ASSERT_FALSE(image.isNull());
     EXPECT_EQ(image.width(), 320);
     EXPECT_EQ(image.height(), 200);
+    EXPECT_FALSE(image.hasAlphaChannel()); // the view is opaque
     // Background, waveform, spectrogram shades and navigator.
     EXPECT_GT(distinct_colours(image), 16u);
 }
