@@ -3,10 +3,14 @@
 #include "tool_run.hpp"
 
 #include <gtest/gtest.h>
+#include <pty.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include <fstream>
 #include <string>
+#include <vector>
 
 using velmtest::run_tool;
 using velmtest::ToolRun;
@@ -20,7 +24,45 @@ void expect_quiet_success(const std::string &arguments)
     EXPECT_EQ(r.output, "") << arguments;
 }
 
+// Runs the tool with a terminal as its standard output and error; what the
+// terminal showed, and the exit code.
+std::pair<std::string, int> run_on_terminal(std::vector<std::string> arguments)
+{
+    std::vector<char *> argv{const_cast<char *>(VELM_TOOL_PATH)};
+    for (std::string &argument : arguments) argv.push_back(argument.data());
+    argv.push_back(nullptr);
+    int terminal = -1;
+    const pid_t child = forkpty(&terminal, nullptr, nullptr, nullptr);
+    if (child == 0) {
+        execv(argv[0], argv.data());
+        _exit(127);
+    }
+    std::string shown;
+    if (child < 0) return {shown, -1};
+    char buffer[4096];
+    ssize_t n;
+    while ((n = read(terminal, buffer, sizeof buffer)) > 0) shown.append(buffer, static_cast<size_t>(n));
+    close(terminal);
+    int status = 0;
+    waitpid(child, &status, 0);
+    return {shown, WIFEXITED(status) ? WEXITSTATUS(status) : -1};
+}
+
 } // namespace
+
+TEST(VelmFiles, ShortWorkShowsNoBarOnATerminal)
+{
+    velmtest::TempDir dir;
+    const std::string in = dir.file("tone.flac");
+    ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(44100, 2, 44100), 44100, 2, SF_FORMAT_FLAC | SF_FORMAT_PCM_16));
+    const auto [shown, code] = run_on_terminal({"convert", in, dir.file("copy.wav")});
+    EXPECT_EQ(code, 0);
+    EXPECT_EQ(shown, "");
+    // The terminal does carry what the tool says.
+    const auto [message, failed] = run_on_terminal({"info", dir.file("missing.wav")});
+    EXPECT_EQ(failed, 1);
+    EXPECT_NE(message.find("no such file"), std::string::npos) << message;
+}
 
 TEST(VelmFiles, EveryCommandWorksOnEveryFileType)
 {
