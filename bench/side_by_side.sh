@@ -24,21 +24,22 @@ echo "making one hour of tones and noise (about 635 MB)..."
 sox -n -r 44100 -c 2 -b 16 "$hour" synth 3600 sine 440 pinknoise gain -6
 cat "$hour" > /dev/null  # every run starts with the file in the page cache
 
-echo "1920x400 pictures of the whole hour; the page cache is warm"
+echo "1920x400 pictures of the whole hour; the page cache is warm; load: $(cut -d' ' -f1-3 /proc/loadavg)"
 # measure NAME COMMAND...: runs the command under /usr/bin/time -v and keeps
 # its wall-clock seconds and peak resident kilobytes in seconds_NAME, kb_NAME.
 measure() {
   local name=$1; shift
   /usr/bin/time -v -o "$work/time.$name" "$@" > /dev/null 2> "$work/err.$name" ||
     { echo "side_by_side: $name failed:" >&2; cat "$work/err.$name" >&2; exit 1; }
-  local clock kb
+  local clock kb cpu
   clock=$(sed -n 's/.*Elapsed (wall clock) time.*: //p' "$work/time.$name")
   kb=$(sed -n 's/.*Maximum resident set size (kbytes): //p' "$work/time.$name")
+  cpu=$(awk -F': ' '/User time|System time/ { s += $2 } END { print s }' "$work/time.$name")
   # h:mm:ss or m:ss.cc to seconds
   printf -v "seconds_$name" '%s' "$(awk -F: '{ s = 0; for (i = 1; i <= NF; i++) s = s * 60 + $i; print s }' <<< "$clock")"
   printf -v "kb_$name" '%s' "$kb"
   local seconds_var="seconds_$name"
-  printf '%-18s %7.2f s   peak memory %6d MB\n' "$name" "${!seconds_var}" $((kb / 1024))
+  printf '%-18s %7.2f s (CPU %6.2f s)   peak memory %6d MB\n' "$name" "${!seconds_var}" "$cpu" $((kb / 1024))
 }
 
 measure velm_waveform "$tool" render "$hour" -o "$work/velm_waveform.png" --size 1920x400 --lanes waveform
