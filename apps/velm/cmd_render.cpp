@@ -5,6 +5,7 @@
 #include <QPixmap>
 #include <QSaveFile>
 #include <cstdio>
+#include <future>
 #include <memory>
 
 #include "apps/velm/render_args.hpp"
@@ -100,10 +101,10 @@ bool mark_up(VELMAUDIO doc, const RenderArgs &args)
     return true;
 }
 
-// Opens the sound, sets up its view and draws it; needs the application.
-int render(const RenderArgs &args)
+// Sets up the view of the opened sound and draws it; needs the application.
+int render(const RenderArgs &args, VELMAUDIO opened)
 {
-    std::unique_ptr<_VELMAUDIO, CloseDocument> doc(velmtool::open_input(args.file));
+    std::unique_ptr<_VELMAUDIO, CloseDocument> doc(opened);
     if (!doc) return 1;
     VELMAUDIO_SetDrawKindOption(doc.get(), args.lanes);
     if (args.from >= 0 || args.to >= 0) {
@@ -156,8 +157,12 @@ int run_render(int argc, char **argv)
     char name[] = "velm";
     char *qt_argv[] = {name, nullptr};
     qInstallMessageHandler(qt_messages);
+    // Opening reads the whole sound and needs nothing of Qt, so it runs while
+    // Qt starts up (fonts, platform), which takes about as long as a minute
+    // of sound takes to open.
+    std::future<VELMAUDIO> opening = std::async(std::launch::async, [&args] { return open_input(args.file); });
     QGuiApplication application(qt_argc, qt_argv);
-    return render(args);
+    return render(args, opening.get());
 }
 
 } // namespace velmtool
