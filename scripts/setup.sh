@@ -2,8 +2,20 @@
 # Installs every Debian package that building, testing and benchmarking libvelm need,
 # then configures and builds. Safe to run again: installed packages are skipped.
 #
-#   scripts/setup.sh [--no-build]
+#   scripts/setup.sh [--bench] [--no-build]
+#
+# --bench adds the tools bench/side_by_side.sh compares against; the tests never need them.
 set -euo pipefail
+
+bench=0
+build=1
+for arg in "$@"; do
+  case "$arg" in
+    --bench) bench=1 ;;
+    --no-build) build=0 ;;
+    *) echo "usage: scripts/setup.sh [--bench] [--no-build]" >&2; exit 2 ;;
+  esac
+done
 
 packages=(
   build-essential g++ cmake ninja-build pkg-config ccache
@@ -13,6 +25,7 @@ packages=(
   libgtest-dev libgmock-dev libbenchmark-dev
   sox time
 )
+[ "$bench" -eq 1 ] && packages+=(ffmpeg)
 
 missing=()
 for p in "${packages[@]}"; do
@@ -30,7 +43,7 @@ if [ ${#missing[@]} -gt 0 ]; then
   "${sudo_cmd[@]}" apt-get install -y -qq --no-install-recommends "${missing[@]}"
 fi
 
-[ "${1:-}" = "--no-build" ] && exit 0
+[ "$build" -eq 0 ] && exit 0
 
 here=$(cd "$(dirname "$0")/.." && pwd)
 "$here/scripts/build.sh" release

@@ -5,6 +5,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <string>
 
 #include "apps/velm/tool.hpp"
 #include "core/velmqueries.h"
@@ -19,6 +20,14 @@ bool parse_seconds(const char *text, double *out)
     if (!text[0] || *end || !std::isfinite(value) || value < 0) return false;
     *out = value;
     return true;
+}
+
+bool parse_range(const char *text, double *from, double *to)
+{
+    const char *colon = std::strchr(text, ':');
+    if (!colon) return false;
+    const std::string first(text, static_cast<size_t>(colon - text));
+    return parse_seconds(first.c_str(), from) && parse_seconds(colon + 1, to) && *from < *to;
 }
 
 bool parse_count(const char *text, long low, long high, long *out)

@@ -2,6 +2,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include "apps/velm/progress.hpp"
 #include "apps/velm/tool.hpp"
 #include "core/velmqueries.h"
 #include "edit/velmedit.h"
@@ -71,9 +72,9 @@ int run_convert(int argc, char **argv)
     VELMAUDIO doc = open_input(args.in);
     if (!doc) return 1;
     bool ok = change_format(doc, args);
-    if (ok && !VELMAUDIO_SaveAs(doc, args.out, args.format)) {
-        std::fprintf(stderr, "velm: cannot write '%s' as %s (error %d)\n", args.out, args.format,
-                     VELMAUDIO_GetLastError());
+    if (ok && !with_progress([&] { return VELMAUDIO_SaveAs(doc, args.out, args.format); })) {
+        std::fprintf(stderr, "velm: cannot write '%s' as %s: %s\n", args.out, args.format,
+                     velmtool::why(args.out, true, AUDIOSIGNAL_GetLastError()).c_str());
         ok = false;
     }
     VELMAUDIO_Close(doc);

@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "apps/velm/progress.hpp"
 #include "apps/velm/tool.hpp"
 #include "core/velmtimeconv.h"
 #include "edit/velmedit.h"
@@ -42,14 +43,6 @@ const char *const kAlone[] = {"--select-all", "--copy", "--cut", "--paste", "--c
                               "--trim",       "--silence", "--reverse", "--remove-dc"};
 const char *const kWithValue[] = {"--select", "--add-select", "--effect", "--append"};
 
-bool parse_range(const char *text, double *from, double *to)
-{
-    const char *colon = std::strchr(text, ':');
-    if (!colon) return false;
-    const std::string first(text, static_cast<size_t>(colon - text));
-    return velmtool::parse_seconds(first.c_str(), from) && velmtool::parse_seconds(colon + 1, to) && *from < *to;
-}
-
 velmtool::Took take(EditArgs *args, const char *option, const char *value)
 {
     using velmtool::Took;
@@ -68,7 +61,7 @@ velmtool::Took take(EditArgs *args, const char *option, const char *value)
         if (std::strcmp(option, name) == 0) {
             double from, to;
             const bool range = std::strstr(name, "select") != nullptr;
-            if (range && !parse_range(value, &from, &to)) return Took::BadValue;
+            if (range && !velmtool::parse_range(value, &from, &to)) return Took::BadValue;
             args->operations.push_back({option, value});
             return velmtool::value_if(*value != '\0');
         }
@@ -87,7 +80,7 @@ bool run(VELMAUDIO doc, const Operation &op, AUDIOSIGNAL **kept)
     };
     if (op.name == "--select" || op.name == "--add-select") {
         double from = 0, to = 0;
-        parse_range(op.value.c_str(), &from, &to);
+        velmtool::parse_range(op.value.c_str(), &from, &to);
         int64_t begin, end;
         if (!velmtool::sample_range(doc, from, to, &begin, &end)) return false;
         return op.name == "--select" ? VELMAUDIO_SelectAudio(doc, begin, end) : VELMAUDIO_AddSelection(doc, begin, end);
@@ -102,7 +95,8 @@ bool run(VELMAUDIO doc, const Operation &op, AUDIOSIGNAL **kept)
     if (op.name == "--reverse") return VELMAUDIO_Reverse(doc, nullptr);
     if (op.name == "--effect") return VELMAUDIO_TransformSelection(doc, op.value.c_str(), nullptr);
     if (op.name == "--remove-dc") return VELMAUDIO_RemoveDC(doc, nullptr);
-    if (op.name == "--append") return VELMAUDIO_AppendFromFile(doc, op.value.c_str(), "AUTO", nullptr);
+    if (op.name == "--append")
+        return velmtool::with_progress([&] { return VELMAUDIO_AppendFromFile(doc, op.value.c_str(), "AUTO", nullptr); });
     std::fprintf(stderr, "velm: unknown operation '%s'\n", name);
     return false;
 }
@@ -129,9 +123,9 @@ int run_edit(int argc, char **argv)
             ok = false;
         }
     }
-    if (ok && !VELMAUDIO_SaveAs(doc, args.out, args.format)) {
-        std::fprintf(stderr, "velm: cannot write '%s' as %s (error %d)\n", args.out, args.format,
-                     VELMAUDIO_GetLastError());
+    if (ok && !velmtool::with_progress([&] { return VELMAUDIO_SaveAs(doc, args.out, args.format); })) {
+        std::fprintf(stderr, "velm: cannot write '%s' as %s: %s\n", args.out, args.format,
+                     velmtool::why(args.out, true, AUDIOSIGNAL_GetLastError()).c_str());
         ok = false;
     }
     AUDIOSIGNAL_Destroy(kept);

@@ -5,95 +5,37 @@
 #include <QPixmap>
 #include <QSaveFile>
 #include <cstdio>
-#include <cstring>
+#include <future>
 #include <memory>
-#include <string>
-#include <vector>
 
+#include "apps/velm/render_args.hpp"
 #include "apps/velm/tool.hpp"
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
+#include "core/velmqueries.h"
+#include "core/velmtimeconv.h"
+#include "edit/velmregion.h"
+#include "edit/velmselection.h"
 #include "outside/base/blbase.h"
 #include "render/canvas/velmcanvas.h"
 #include "render/view/velmdraw.h"
 
 namespace {
 
+using velmtool::RenderArgs;
+
 const char kUsage[] =
     "usage: velm render [FILE] -o OUT.png [--size WxH] [--lanes waveform|spectrogram|both]\n"
-    "                   [--from SECONDS] [--to SECONDS] [--set libvelm.KEY=VALUE ...]\n";
-
-// Three pixmaps of this size are held at once, so the bound keeps a
-// mistyped size from asking for gigabytes.
-constexpr long kMaxWidth = 8192;
-constexpr long kMaxHeight = 4096;
-constexpr long kMinSide = 64;
-
-struct RenderArgs {
-    const char *file = nullptr;
-    const char *out = nullptr;
-    int width = 1200;
-    int height = 400;
-    uint32_t lanes = 3;
-    double from = -1.0;
-    double to = -1.0;
-    std::vector<const char *> settings;
-};
-
-bool parse_size(const char *text, RenderArgs *args)
-{
-    const char *x = std::strchr(text, 'x');
-    if (!x) return false;
-    const std::string width(text, x);
-    long w = 0, h = 0;
-    if (!velmtool::parse_count(width.c_str(), kMinSide, kMaxWidth, &w) ||
-        !velmtool::parse_count(x + 1, kMinSide, kMaxHeight, &h))
-        return false;
-    args->width = static_cast<int>(w);
-    args->height = static_cast<int>(h);
-    return true;
-}
-
-bool parse_lanes(const char *text, uint32_t *lanes)
-{
-    const char *names[] = {"waveform", "spectrogram", "both"};
-    for (uint32_t kind = 1; kind <= 3; ++kind)
-        if (std::strcmp(text, names[kind - 1]) == 0) {
-            *lanes = kind;
-            return true;
-        }
-    return false;
-}
-
-// A "libvelm." key with a name and a value sign; the value may be empty.
-bool is_setting(const char *text)
-{
-    static const char prefix[] = "libvelm.";
-    const size_t n = sizeof prefix - 1;
-    const char *equals = std::strchr(text, '=');
-    return std::strncmp(text, prefix, n) == 0 && equals && equals > text + n;
-}
-
-velmtool::Took take(RenderArgs *args, const char *option, const char *value)
-{
-    using velmtool::Took;
-    using velmtool::value_if;
-    if (option[0] != '-') return velmtool::word_into(&args->file, option);
-    if (!value) return Took::Nothing;
-    if (std::strcmp(option, "-o") == 0) {
-        args->out = value;
-        return Took::Value;
-    }
-    if (std::strcmp(option, "--size") == 0) return value_if(parse_size(value, args));
-    if (std::strcmp(option, "--lanes") == 0) return value_if(parse_lanes(value, &args->lanes));
-    if (std::strcmp(option, "--from") == 0) return value_if(velmtool::parse_seconds(value, &args->from));
-    if (std::strcmp(option, "--to") == 0) return value_if(velmtool::parse_seconds(value, &args->to));
-    if (std::strcmp(option, "--set") == 0) {
-        args->settings.push_back(value);
-        return value_if(is_setting(value));
-    }
-    return Took::Nothing;
-}
+    "                   [--from SECONDS] [--to SECONDS] [--select FROM:TO ...] [--cursor SECONDS]\n"
+    "                   [--regions FILE] [--horz-scale KIND] [--vert-scale KIND] [--spec-scale KIND]\n"
+    "                   [--set libvelm.KEY=VALUE ...] [--verbose]\n"
+    "  --select FROM:TO   select FROM .. TO seconds; repeat to select more ranges\n"
+    "  --cursor SECONDS   put the edit cursor there\n"
+    "  --regions FILE     draw the regions of FILE (label text, region file or WAV cues)\n"
+    "  --horz-scale KIND  sample, time, frame, sample_view, time_view or frame_view\n"
+    "  --vert-scale KIND  sample, db, percentual or normalized\n"
+    "  --spec-scale KIND  hz or mels\n"
+    "  --verbose          say on standard error what the document holds before drawing\n";
 
 struct CloseDocument {
     void operator()(_VELMAUDIO *doc) const { VELMAUDIO_Close(doc); }
@@ -110,16 +52,59 @@ void qt_messages(QtMsgType type, const QMessageLogContext &, const QString &text
 }
 
 // Written through a temporary file, so a failed write leaves OUT as it was.
+// The view is opaque, so the picture goes without an alpha channel; and
+// with zlib's fast level: compressing a dense picture was half of a short
+// sound's render; the fast level halves that for about a third more bytes.
 bool save_png(const QImage &image, const char *path)
 {
+    constexpr int kFastCompression = 80;
     QSaveFile file(QString::fromLocal8Bit(path));
-    return file.open(QIODevice::WriteOnly) && image.save(&file, "PNG") && file.commit();
+    return file.open(QIODevice::WriteOnly) &&
+           image.convertToFormat(QImage::Format_RGB32).save(&file, "PNG", kFastCompression) && file.commit();
 }
 
-// Opens the sound, sets up its view and draws it; needs the application.
-int render(const RenderArgs &args)
+// Puts the regions, selections, cursor and scale kinds into the document;
+// false after a message when one of them does not fit the sound.
+bool mark_up(VELMAUDIO doc, const RenderArgs &args)
 {
-    std::unique_ptr<_VELMAUDIO, CloseDocument> doc(velmtool::open_input(args.file));
+    if (args.regions && !VELMAUDIO_ReadRegions(doc, args.regions, "AUTO")) {
+        std::fprintf(stderr, "velm: cannot read the regions in '%s': %s\n", args.regions,
+                     velmtool::why(args.regions, false, AUDIOSIGNAL_GetLastError()).c_str());
+        return false;
+    }
+    for (const char *text : args.selections) {
+        double from = 0, to = 0;
+        int64_t begin = 0, end = 0;
+        velmtool::parse_range(text, &from, &to);
+        if (!velmtool::sample_range(doc, from, to, &begin, &end) || !VELMAUDIO_AddSelection(doc, begin, end)) {
+            std::fprintf(stderr, "velm: the selection %s holds no samples\n", text);
+            return false;
+        }
+    }
+    if (args.cursor >= 0) {
+        const int64_t sample = VELMAUDIO_TimeToSample(doc, args.cursor);
+        if (sample > VELMAUDIO_NumSamples(doc)) {
+            std::fprintf(stderr, "velm: the cursor at %g s is past the end of the sound\n", args.cursor);
+            return false;
+        }
+        // False only when the cursor is there already.
+        VELMAUDIO_SetCursorPosition(doc, sample);
+    }
+    for (const auto &[property, kind] : args.scales)
+        if (!VELMAUDIO_SetDrawProperty(doc, property, kind)) {
+            std::fprintf(stderr, "velm: cannot set the scale kind\n");
+            return false;
+        }
+    if (args.verbose)
+        std::fprintf(stderr, "velm: %d regions, %d selections\n",
+                     VELMAUDIO_CountVisibleRegions(doc, 0, 0, 0, 0, nullptr), VELMAUDIO_SelectionChunkCount(doc));
+    return true;
+}
+
+// Sets up the view of the opened sound and draws it; needs the application.
+int render(const RenderArgs &args, VELMAUDIO opened)
+{
+    std::unique_ptr<_VELMAUDIO, CloseDocument> doc(opened);
     if (!doc) return 1;
     VELMAUDIO_SetDrawKindOption(doc.get(), args.lanes);
     if (args.from >= 0 || args.to >= 0) {
@@ -130,6 +115,7 @@ int render(const RenderArgs &args)
             return 1;
         }
     }
+    if (!mark_up(doc.get(), args)) return 1;
     std::unique_ptr<_VELMCANVAS, DestroyCanvas> canvas(VELMCANVAS_CreateCanvasQT(nullptr, args.width, args.height));
     if (!canvas || !VELMCANVAS_ResizeCanvas(canvas.get(), args.width, args.height)) {
         std::fprintf(stderr, "velm: cannot make a %dx%d canvas\n", args.width, args.height);
@@ -146,7 +132,7 @@ int render(const RenderArgs &args)
     // The output pixmap may be larger than the canvas; keep the canvas's part.
     const auto *pixmap = static_cast<const QPixmap *>(VELMCANVAS_GetOutputHandle(canvas.get()));
     if (!pixmap || !save_png(pixmap->toImage().copy(0, 0, args.width, args.height), args.out)) {
-        std::fprintf(stderr, "velm: cannot write '%s'\n", args.out);
+        std::fprintf(stderr, "velm: cannot write '%s': %s\n", args.out, velmtool::why(args.out, true, AUDIO_ERROR_NONE).c_str());
         return 1;
     }
     return 0;
@@ -160,7 +146,7 @@ int run_render(int argc, char **argv)
 {
     RenderArgs args;
     const char *bad = nullptr;
-    const auto option = [&args](const char *text, const char *value) { return take(&args, text, value); };
+    const auto option = [&args](const char *text, const char *value) { return take_render_argument(&args, text, value); };
     if (!walk_arguments(argc, argv, option, &bad) || !args.out) return decline(argc, argv, bad, kUsage);
     for (const char *setting : args.settings) BLSETTINGS_ChangeEx(nullptr, "%s", setting);
 
@@ -171,8 +157,12 @@ int run_render(int argc, char **argv)
     char name[] = "velm";
     char *qt_argv[] = {name, nullptr};
     qInstallMessageHandler(qt_messages);
+    // Opening reads the whole sound and needs nothing of Qt, so it runs while
+    // Qt starts up (fonts, platform), which takes about as long as a minute
+    // of sound takes to open.
+    std::future<VELMAUDIO> opening = std::async(std::launch::async, [&args] { return open_input(args.file); });
     QGuiApplication application(qt_argc, qt_argv);
-    return render(args);
+    return render(args, opening.get());
 }
 
 } // namespace velmtool

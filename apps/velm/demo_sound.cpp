@@ -5,6 +5,7 @@
 #include <cstdio>
 #include <vector>
 
+#include "apps/velm/progress.hpp"
 #include "apps/velm/tool.hpp"
 #include "core/velmqueries.h"
 
@@ -126,8 +127,8 @@ VELMAUDIO open_input(const char *file)
         if (!doc) std::fprintf(stderr, "velm: could not make the demo sound\n");
         return doc;
     }
-    VELMAUDIO doc = VELMAUDIO_Open(file, "AUTO");
-    if (!doc) std::fprintf(stderr, "velm: cannot open '%s' (error %d)\n", file, VELMAUDIO_GetLastError());
+    VELMAUDIO doc = with_progress([file] { return VELMAUDIO_Open(file, "AUTO"); });
+    if (!doc) std::fprintf(stderr, "velm: cannot open '%s': %s\n", file, why(file, false, AUDIOSIGNAL_GetLastError()).c_str());
     return doc;
 }
 

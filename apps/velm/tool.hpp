@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <functional>
+#include <string>
 
 #include "core/velmaudio.h"
 
@@ -20,6 +21,8 @@ VELMAUDIO open_input(const char *file);
 // Option values: false unless the whole text is a number in range.
 bool parse_seconds(const char *text, double *out);
 bool parse_count(const char *text, long low, long high, long *out);
+// "FROM:TO" in seconds, FROM before TO.
+bool parse_range(const char *text, double *from, double *to);
 
 // What a command made of one argument: an option with its value (the next
 // argument), a word standing alone, an option whose value it refused, or
@@ -49,6 +52,11 @@ int decline(int argc, char **argv, const char *bad, const char *usage);
 // document; a negative time stands for its start or end.  False when the
 // range holds no samples.
 bool sample_range(VELMAUDIO doc, double from, double to, int64_t *begin, int64_t *end);
+
+// Why the work on path failed, in a few words: what the path itself shows
+// (no such file, a folder, no such folder...), else the signal library's
+// error bits (AUDIOSIGNAL_GetLastError).
+std::string why(const char *path, bool writing, int error);
 
 int run_info(int argc, char **argv);
 int run_render(int argc, char **argv);

@@ -206,6 +206,14 @@ AUDIO_API _audio_format AUDIO_GetAudioFileFormat(const AUDIO_FILE *file);
 /* Closes; a written file is committed.  1 on success. */
 AUDIO_API int AUDIO_CloseFile(AUDIO_FILE *file);
 
+/* Progress of the calling thread's long file work: opening a signal from a
+ * file (AUDIOSIGNAL_OpenEx) and saving one (AUDIOSIGNAL_Save) call back with
+ * the fraction done, rising in steps of at least a hundredth and ending with
+ * exactly 1.0 when the work succeeds.  The callback runs on the calling
+ * thread, inside the call; null turns reporting off.  Returns 1. */
+typedef void (*AUDIO_PROGRESS_CALLBACK)(void *user, double fraction);
+AUDIO_API int AUDIO_SetProgressCallback(AUDIO_PROGRESS_CALLBACK callback, void *user);
+
 /* The calling thread's last error (AUDIO_ERROR_* bits; 0 after a reset).
  * Calls that fail set it; calls that succeed leave it alone. */
 AUDIO_API int  AUDIOSIGNAL_GetLastError(void);

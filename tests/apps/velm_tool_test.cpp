@@ -1,66 +1,23 @@
 // The velm tool, run as a program: what it prints for the demo sound and for files.
 #include "testaudio.hpp"
+#include "tool_run.hpp"
 
 #include <gtest/gtest.h>
 
 #include <algorithm>
 
 #include <QImage>
-#include <cstdio>
 #include <cstdlib>
 #include <fstream>
-#include <set>
-#include <sstream>
 #include <string>
 
 namespace {
 
-struct ToolRun {
-    int status;
-    std::string output;
-};
-
-ToolRun run(const std::string &arguments)
-{
-    const std::string command = std::string(VELM_TOOL_PATH) + " " + arguments + " 2>&1";
-    FILE *pipe = popen(command.c_str(), "r");
-    ToolRun r{-1, {}};
-    if (!pipe) return r;
-    char buffer[4096];
-    size_t n;
-    while ((n = fread(buffer, 1, sizeof buffer, pipe)) > 0) r.output.append(buffer, n);
-    r.status = pclose(pipe);
-    return r;
-}
-
-bool has(const ToolRun &r, const std::string &text)
-{
-    return r.output.find(text) != std::string::npos;
-}
-
-// Runs the tool and expects the exit status and a message holding text.
-void expect_failure(const std::string &arguments, int status, const std::string &text)
-{
-    const ToolRun r = run(arguments);
-    EXPECT_EQ(WEXITSTATUS(r.status), status) << arguments;
-    EXPECT_TRUE(has(r, text)) << arguments << ": " << r.output;
-}
-
-size_t distinct_colours(const QImage &image)
-{
-    std::set<QRgb> colours;
-    for (int y = 0; y < image.height(); ++y)
-        for (int x = 0; x < image.width(); ++x) colours.insert(image.pixel(x, y));
-    return colours.size();
-}
-
-std::string contents(const std::string &path)
-{
-    std::ifstream in(path, std::ios::binary);
-    std::ostringstream text;
-    text << in.rdbuf();
-    return text.str();
-}
+using velmtest::contents;
+using velmtest::distinct_colours;
+using velmtest::expect_failure;
+using velmtest::run_tool;
+using velmtest::ToolRun;
 
 // What libsndfile reads in a file's header; all zero when it cannot open it.
 SF_INFO file_info(const std::string &path)
@@ -83,13 +40,13 @@ int zero_crossings(const std::vector<float> &frames, int channels)
 
 TEST(VelmTool, InfoOnTheDemoSound)
 {
-    const ToolRun r = run("info");
+    const ToolRun r = run_tool("info");
     ASSERT_EQ(r.status, 0) << r.output;
-    EXPECT_TRUE(has(r, "44100 Hz")) << r.output;
-    EXPECT_TRUE(has(r, "176400 samples (4.000 s)")) << r.output;
-    EXPECT_TRUE(has(r, "Demo sound")) << r.output;
-    EXPECT_TRUE(has(r, "channel 1: peak")) << r.output;
-    EXPECT_TRUE(has(r, "channel 2: peak")) << r.output;
+    EXPECT_TRUE(r.has("44100 Hz")) << r.output;
+    EXPECT_TRUE(r.has("176400 samples (4.000 s)")) << r.output;
+    EXPECT_TRUE(r.has("Demo sound")) << r.output;
+    EXPECT_TRUE(r.has("channel 1: peak")) << r.output;
+    EXPECT_TRUE(r.has("channel 2: peak")) << r.output;
 }
 
 TEST(VelmTool, InfoMeasuresAFile)
@@ -99,11 +56,11 @@ TEST(VelmTool, InfoMeasuresAFile)
     // A full-scale half: peak 0.5 is -6.02 dBFS; a constant 0.5 has RMS 0.5 and DC 0.5.
     std::vector<float> frames(8000, 0.5f);
     ASSERT_TRUE(velmtest::write_audio(path, frames, 8000, 1, SF_FORMAT_WAV | SF_FORMAT_FLOAT));
-    const ToolRun r = run("info " + path + " --from 0.25 --to 0.75");
+    const ToolRun r = run_tool("info " + path + " --from 0.25 --to 0.75");
     ASSERT_EQ(r.status, 0) << r.output;
-    EXPECT_TRUE(has(r, "8000 Hz")) << r.output;
-    EXPECT_TRUE(has(r, "0.250 s .. 0.750 s")) << r.output;
-    EXPECT_TRUE(has(r, "peak 0.5000 (-6.02 dBFS), RMS 0.5000 (-6.02 dBFS), DC offset +0.500000")) << r.output;
+    EXPECT_TRUE(r.has("8000 Hz")) << r.output;
+    EXPECT_TRUE(r.has("0.250 s .. 0.750 s")) << r.output;
+    EXPECT_TRUE(r.has("peak 0.5000 (-6.02 dBFS), RMS 0.5000 (-6.02 dBFS), DC offset +0.500000")) << r.output;
 }
 
 TEST(VelmTool, BadInputFailsWithAMessage)
@@ -121,7 +78,7 @@ TEST(VelmTool, RenderDrawsTheDemoSoundWithoutADisplay)
     // The tool picks the offscreen platform itself when none is named.
     const std::string saved = std::getenv("QT_QPA_PLATFORM") ? std::getenv("QT_QPA_PLATFORM") : "";
     unsetenv("QT_QPA_PLATFORM");
-    const ToolRun r = run("render -o " + out + " --size 320x200");
+    const ToolRun r = run_tool("render -o " + out + " --size 320x200");
     if (!saved.empty()) setenv("QT_QPA_PLATFORM", saved.c_str(), 1);
     ASSERT_EQ(r.status, 0) << r.output;
     EXPECT_EQ(r.output, "");
@@ -129,6 +86,7 @@ TEST(VelmTool, RenderDrawsTheDemoSoundWithoutADisplay)
     ASSERT_FALSE(image.isNull());
     EXPECT_EQ(image.width(), 320);
     EXPECT_EQ(image.height(), 200);
+    EXPECT_FALSE(image.hasAlphaChannel()); // the view is opaque
     // Background, waveform, spectrogram shades and navigator.
     EXPECT_GT(distinct_colours(image), 16u);
 }
@@ -143,7 +101,7 @@ TEST(VelmTool, RenderOptionsChangeThePicture)
 
     auto render = [&](const std::string &name, const std::string &options) {
         const std::string out = dir.file(name + ".png");
-        const ToolRun r = run("render " + sound + " -o " + out + " --size 400x240 " + options);
+        const ToolRun r = run_tool("render " + sound + " -o " + out + " --size 400x240 " + options);
         EXPECT_EQ(r.status, 0) << options << ": " << r.output;
         return QImage(QString::fromStdString(out), "PNG");
     };
@@ -179,9 +137,9 @@ TEST(VelmTool, RenderRefusesBadArgumentsAndKeepsTheOutput)
     EXPECT_EQ(contents(out), "old picture");
 
     expect_failure("render -o " + dir.file("no/such/folder.png"), 1, "cannot write");
-    const ToolRun r = run("render --help");
+    const ToolRun r = run_tool("render --help");
     EXPECT_EQ(r.status, 0);
-    EXPECT_TRUE(has(r, "usage: velm render")) << r.output;
+    EXPECT_TRUE(r.has("usage: velm render")) << r.output;
 }
 
 TEST(VelmTool, ConvertResamplesAndMixesDownKeepingThePitch)
@@ -190,7 +148,7 @@ TEST(VelmTool, ConvertResamplesAndMixesDownKeepingThePitch)
     const std::string in = dir.file("sine.wav");
     const std::string out = dir.file("mono.wav");
     ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(44100, 2, 44100, 440.0), 44100, 2));
-    const ToolRun r = run("convert " + in + " " + out + " --rate 16000 --channels 1");
+    const ToolRun r = run_tool("convert " + in + " " + out + " --rate 16000 --channels 1");
     ASSERT_EQ(r.status, 0) << r.output;
     int rate = 0, channels = 0;
     const std::vector<float> frames = velmtest::read_audio(out, &rate, &channels);
@@ -206,9 +164,9 @@ TEST(VelmTool, ConvertTakesTheTypeFromTheExtensionOrTheFormat)
     velmtest::TempDir dir;
     const std::string in = dir.file("sine.wav");
     ASSERT_TRUE(velmtest::write_audio(in, velmtest::sine(22050, 2, 22050, 1000.0), 22050, 2));
-    ToolRun r = run("convert " + in + " " + dir.file("copy.flac"));
+    ToolRun r = run_tool("convert " + in + " " + dir.file("copy.flac"));
     ASSERT_EQ(r.status, 0) << r.output;
-    r = run("convert " + in + " " + dir.file("copy.snd") + " --format AIFF --channels 3");
+    r = run_tool("convert " + in + " " + dir.file("copy.snd") + " --format AIFF --channels 3");
     ASSERT_EQ(r.status, 0) << r.output;
 
     const SF_INFO flac = file_info(dir.file("copy.flac"));
@@ -246,9 +204,9 @@ TEST(VelmTool, EditRunsItsStepsInOrder)
     for (size_t i = 0; i < ramp.size(); ++i) ramp[i] = static_cast<float>(i) / 8000.0f;
     ASSERT_TRUE(velmtest::write_audio(in, ramp, 8000, 1, SF_FORMAT_WAV | SF_FORMAT_FLOAT));
     // Cut the second quarter, paste it at the start, reverse the last tenth.
-    const ToolRun r = run("edit " + in + " " + out +
+    const ToolRun r = run_tool("edit " + in + " " + out +
                           " --select 0.25:0.5 --cut --select 0:0.001 --paste --select 0.9:1 --reverse");
-    ASSERT_EQ(WEXITSTATUS(r.status), 0) << r.output;
+    ASSERT_EQ(r.exit_code(), 0) << r.output;
     const std::vector<float> edited = velmtest::read_audio(out);
     std::vector<float> expected(ramp.begin() + 2000, ramp.begin() + 4000);
     expected.insert(expected.end(), ramp.begin() + 8, ramp.begin() + 2000);

@@ -10,6 +10,7 @@ list(APPEND VELMSIGNAL_SOURCES
   ${CMAKE_CURRENT_LIST_DIR}/link.cpp
   ${CMAKE_CURRENT_LIST_DIR}/metadata.cpp
   ${CMAKE_CURRENT_LIST_DIR}/open_reader.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/progress.cpp
   ${CMAKE_CURRENT_LIST_DIR}/sample16.cpp
   ${CMAKE_CURRENT_LIST_DIR}/sfmap.cpp
   ${CMAKE_CURRENT_LIST_DIR}/sndfile_reader.cpp

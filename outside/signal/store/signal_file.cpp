@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "outside/signal/file/audiofile_internal.hpp"
+#include "outside/signal/file/progress_internal.hpp"
 #include "outside/signal/store/sample_source.hpp"
 #include "outside/signal/store/signal_internal.hpp"
 
@@ -54,7 +55,8 @@ std::vector<std::vector<MinMax>> summarize_piece(SampleSource &source, int64_t a
 }
 
 // PCM read in place: chunks keep only their summaries and read the file
-// later.  The pieces are independent, so threads share the scan.
+// later.  The pieces are independent, so threads share the scan; the
+// calling thread alone reports the progress, counting every thread's pieces.
 bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<SegmentsPtr> &result)
 {
     const int channels = source->channels();
@@ -62,8 +64,10 @@ bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<Segm
     std::vector<std::vector<ChunkPtr>> chunks(static_cast<size_t>(channels),
                                              std::vector<ChunkPtr>(static_cast<size_t>(pieces)));
     std::atomic<int64_t> next{0};
+    std::atomic<int64_t> done{0};
     std::atomic<bool> failed{false};
-    auto work = [&] {
+    ProgressReport progress(pieces);
+    auto work = [&](bool reporting) {
         std::vector<float> frames(size_t(kScanFrames) * size_t(channels));
         for (int64_t k = next++; k < pieces && !failed; k = next++) {
             const int64_t at = k * kSourceChunkFrames, n = std::min(kSourceChunkFrames, source->frames() - at);
@@ -75,12 +79,14 @@ bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<Segm
             for (int c = 0; c < channels; ++c) {
                 chunks[size_t(c)][size_t(k)] = make_source_chunk(source, c, at, n, std::move(windows[size_t(c)]));
             }
+            const int64_t pieces_done = ++done;
+            if (reporting) progress.advance(pieces_done);
         }
     };
     const unsigned helpers = std::min(3u, std::max(1u, std::thread::hardware_concurrency()) - 1);
     std::vector<std::thread> threads;
-    for (unsigned t = 0; t < helpers && int64_t(t + 1) < pieces; ++t) threads.emplace_back(work);
-    work();
+    for (unsigned t = 0; t < helpers && int64_t(t + 1) < pieces; ++t) threads.emplace_back(work, false);
+    work(true);
     for (std::thread &thread : threads) thread.join();
     if (failed) return false;
     for (int c = 0; c < channels; ++c) {
@@ -91,6 +97,7 @@ bool scan_in_place(const std::shared_ptr<SampleSource> &source, std::vector<Segm
         }
         result.push_back(builder.build());
     }
+    progress.finish();
     return true;
 }
 
@@ -102,7 +109,9 @@ bool scan_decoded(SampleSource &source, std::vector<SegmentsPtr> &result)
     std::vector<float> frames(size_t(kChunkFrames) * size_t(channels));
     std::vector<float> samples(static_cast<size_t>(kChunkFrames));
     std::vector<SegmentsBuilder> builders(static_cast<size_t>(channels));
+    ProgressReport progress(source.frames());
     for (int64_t at = 0, n = kChunkFrames; n == kChunkFrames; at += n) {
+        progress.advance(at);
         n = source.read(at, frames.data(), kChunkFrames);
         if (n < 0) return false;
         for (int c = 0; c < channels; ++c) {
@@ -111,6 +120,7 @@ bool scan_decoded(SampleSource &source, std::vector<SegmentsPtr> &result)
         }
     }
     for (SegmentsBuilder &builder : builders) result.push_back(builder.build());
+    progress.finish();
     return true;
 }
 
@@ -191,7 +201,9 @@ int AUDIOSIGNAL_Save(AUDIOSIGNAL *signal, const char *file_name, const char *for
     const int64_t length = channels[0]->length();
     std::vector<float> samples(static_cast<size_t>(kChunkFrames));
     std::vector<float> frames(size_t(kChunkFrames) * width);
+    ProgressReport progress(length);
     for (int64_t at = 0; at < length; at += kChunkFrames) {
+        progress.advance(at);
         const int64_t n = std::min(kChunkFrames, length - at);
         for (size_t c = 0; c < width; ++c) {
             if (!channels[c]->read(at, n, samples.data())) {
@@ -204,6 +216,7 @@ int AUDIOSIGNAL_Save(AUDIOSIGNAL *signal, const char *file_name, const char *for
     }
     if (!writer->commit()) return 0;
     bind_file(*signal, file_name, format_text && *format_text ? format_text : "AUTO");
+    progress.finish();
     return 1;
 }
 
