@@ -14,6 +14,7 @@
 #include "core/velmnavigation.h"
 #include "core/velmqueries.h"
 #include "core/velmtimeconv.h"
+#include "edit/velmcustomtrack.h"
 #include "edit/velmregion.h"
 #include "edit/velmselection.h"
 #include "outside/base/blbase.h"
@@ -71,6 +72,12 @@ bool mark_up(VELMAUDIO doc, const RenderArgs &args)
         std::fprintf(stderr, "velm: cannot read the regions in '%s': %s\n", args.regions,
                      velmtool::why(args.regions, false, AUDIOSIGNAL_GetLastError()).c_str());
         return false;
+    }
+    // Regions read from a file land on the default track, drawn under the
+    // lanes with their labels.
+    if (args.regions) {
+        VELMAUDIO_ChangeSetting(doc, "libvelm.customtrack.default.options=SHOWRGNLABEL");
+        VELMAUDIO_ShowCustomTrack(doc, "default");
     }
     for (const char *text : args.selections) {
         double from = 0, to = 0;

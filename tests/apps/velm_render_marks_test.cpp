@@ -55,6 +55,26 @@ TEST_F(VelmRenderMarks, SelectionsRegionsAndTheCursorReachTheDocument)
     EXPECT_EQ(r.output, "");
 }
 
+// Each mark is drawn: selections over the lanes, the regions in the default
+// track under them, the cursor as a line.
+TEST_F(VelmRenderMarks, MarksAreDrawn)
+{
+    const QImage plain = render("plain", "--lanes waveform");
+    const QImage selected = render("selected", "--lanes waveform --select 0.5:1.0");
+    const QImage regions = render("regions", "--lanes waveform --regions " + labels);
+    const QImage cursor = render("cursor", "--lanes waveform --cursor 1.25");
+    ASSERT_FALSE(plain.isNull());
+    for (const QImage *marked : {&selected, &regions, &cursor}) EXPECT_NE(*marked, plain);
+    // The selection lightens the lanes over its columns only, about a
+    // quarter of the width (the lanes end at the vertical scales).
+    const int y = plain.height() / 3;
+    int lighter = 0;
+    for (int x = 0; x < plain.width(); ++x)
+        if (qGray(selected.pixel(x, y)) > qGray(plain.pixel(x, y))) ++lighter;
+    EXPECT_GT(lighter, plain.width() / 6);
+    EXPECT_LT(lighter, plain.width() / 3);
+}
+
 TEST_F(VelmRenderMarks, ScaleKindsChangeThePicture)
 {
     const QImage waveform = render("waveform", "--lanes waveform"); // time and sample value scales
