@@ -167,11 +167,15 @@ private:
     // A RIFF header counts the data bytes in 32 bits, so a recording of more
     // than 4 GB written by a tool that does not switch to a 64-bit header
     // claims its length modulo 4 GB.  The file itself tells how many whole
-    // wraps were written: trailing chunks are far smaller than 4 GB.
+    // wraps were written: trailing chunks are far smaller than 4 GB.  The
+    // claimed frames drop the bytes of a frame cut by the wrap, so the whole
+    // count rounds up, within what the file holds.
     static int64_t unwrapped_length(int64_t frames, int64_t bytes_after_start, int64_t bytes_per_frame) {
         const int64_t claimed = frames * bytes_per_frame;
         const int64_t wraps = (bytes_after_start - claimed) >> 32;
-        return wraps > 0 ? (claimed + (wraps << 32)) / bytes_per_frame : frames;
+        if (wraps <= 0) return frames;
+        const int64_t bytes = claimed + (wraps << 32);
+        return std::min((bytes + bytes_per_frame - 1) / bytes_per_frame, bytes_after_start / bytes_per_frame);
     }
 
     UniqueFd fd_;

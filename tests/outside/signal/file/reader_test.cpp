@@ -127,27 +127,32 @@ TEST(Reader, KeepsReadingAFileDeletedOrRenamedOver) {
 
 // A RIFF header holds 32-bit sizes: a tool that writes more than 4 GB of
 // samples without switching to a 64-bit header leaves the size modulo 4 GB.
-// The file is sparse, so the test costs no disk space.
+// The files are sparse, so the tests cost no disk space.
+static void write_wrapped_wave(const std::string &path, uint16_t channels, uint16_t bits, int64_t data_bytes,
+                        const std::vector<uint8_t> &last_frame) {
+    std::FILE *f = std::fopen(path.c_str(), "wb");
+    ASSERT_NE(f, nullptr);
+    const auto u32 = [&](uint32_t v) { std::fwrite(&v, 4, 1, f); };
+    const auto u16 = [&](uint16_t v) { std::fwrite(&v, 2, 1, f); };
+    const uint16_t block = static_cast<uint16_t>(channels * bits / 8);
+    std::fputs("RIFF", f);
+    u32(static_cast<uint32_t>(36 + data_bytes));
+    std::fputs("WAVEfmt ", f);
+    u32(16), u16(1), u16(channels), u32(44100), u32(44100u * block), u16(block), u16(bits);
+    std::fputs("data", f);
+    u32(static_cast<uint32_t>(data_bytes));
+    ASSERT_EQ(fseeko(f, 44 + data_bytes - int64_t(last_frame.size()), SEEK_SET), 0);
+    std::fwrite(last_frame.data(), last_frame.size(), 1, f);
+    ASSERT_EQ(std::fclose(f), 0);
+}
+
 TEST(Reader, PlainWaveBeyondFourGigabytesOpensWithItsWholeLength) {
     TempDir dir;
     const std::string path = dir.file("long.wav");
     const int64_t data_bytes = (int64_t{1} << 32) + 4000;  // stereo 16-bit frames
     const int16_t last[4] = {1000, -1000, 2000, -2000};
-    {
-        std::FILE *f = std::fopen(path.c_str(), "wb");
-        ASSERT_NE(f, nullptr);
-        const auto u32 = [&](uint32_t v) { std::fwrite(&v, 4, 1, f); };
-        const auto u16 = [&](uint16_t v) { std::fwrite(&v, 2, 1, f); };
-        std::fputs("RIFF", f);
-        u32(static_cast<uint32_t>(36 + data_bytes));
-        std::fputs("WAVEfmt ", f);
-        u32(16), u16(1), u16(2), u32(44100), u32(44100 * 4), u16(4), u16(16);
-        std::fputs("data", f);
-        u32(static_cast<uint32_t>(data_bytes));
-        ASSERT_EQ(fseeko(f, 44 + data_bytes - 8, SEEK_SET), 0);
-        std::fwrite(last, sizeof last, 1, f);
-        ASSERT_EQ(std::fclose(f), 0);
-    }
+    const auto *bytes = reinterpret_cast<const uint8_t *>(last);
+    write_wrapped_wave(path, 2, 16, data_bytes, std::vector<uint8_t>(bytes, bytes + sizeof last));
     auto reader = open_reader(path.c_str(), "AUTO");
     ASSERT_NE(reader, nullptr);
     ASSERT_EQ(reader->frames(), data_bytes / 4);
@@ -155,6 +160,23 @@ TEST(Reader, PlainWaveBeyondFourGigabytesOpensWithItsWholeLength) {
     ASSERT_EQ(reader->read(reader->frames() - 2, got, 2), 2);
     for (int i = 0; i < 4; ++i) EXPECT_FLOAT_EQ(got[i], last[i] / 32768.0f) << i;
     EXPECT_EQ(reader->read(reader->frames(), got, 1), 0);
+}
+
+// Six-byte frames do not divide 4 GB: the wrapped size is not a whole number
+// of frames, yet every frame of the file is still there.
+TEST(Reader, WrappedWaveWithFramesThatDoNotDivideFourGigabytesKeepsItsLastFrame) {
+    TempDir dir;
+    const std::string path = dir.file("long24.wav");
+    const int64_t frames = ((int64_t{1} << 32) / 6) + 1000;  // stereo 24-bit frames
+    const std::vector<uint8_t> last = {0x00, 0x00, 0x10, 0x00, 0x00, 0xF0};  // 0x100000, -0x100000
+    write_wrapped_wave(path, 2, 24, frames * 6, last);
+    auto reader = open_reader(path.c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr);
+    ASSERT_EQ(reader->frames(), frames);
+    float got[2] = {};
+    ASSERT_EQ(reader->read(frames - 1, got, 1), 1);
+    EXPECT_FLOAT_EQ(got[0], 0.125f);
+    EXPECT_FLOAT_EQ(got[1], -0.125f);
 }
 
 TEST(Reader, ReadsHeadlessFilesAsTheFormatStringSays) {
