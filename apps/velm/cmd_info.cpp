@@ -33,14 +33,37 @@ void print_tag(const char *name, const char *value)
     if (value && *value) std::printf("%-10s %s\n", name, value);
 }
 
-void print_channels(const AUDIOSIGNAL_STATISTICS &stats)
+// Silence is -200 dB, as in the statistics record.
+double to_dbfs(double amplitude)
 {
+    return amplitude > 1e-10 ? 20.0 * std::log10(amplitude) : -200.0;
+}
+
+void print_channel(int channel, double peak, double rms, double mean)
+{
+    std::printf("channel %d: peak %.4f (%.2f dBFS), RMS %.4f (%.2f dBFS), DC offset %+.6f\n", channel + 1, peak,
+                to_dbfs(peak), rms, to_dbfs(rms), mean);
+}
+
+// Peak, RMS and DC offset of every channel over the `count` frames measured.
+// The statistics record holds the first channels only; the others are read
+// one by one.
+bool print_channels(VELMAUDIO doc, int64_t count)
+{
+    AUDIOSIGNAL_STATISTICS stats{};
+    if (!VELMAUDIO_GetSignalStats(doc, &stats, 0.05, 0)) return false;
     for (int c = 0; c < stats.numChannels; ++c) {
         const AUDIOSIGNAL_CHANNELSTATS &s = stats.channel[c];
-        const double peak = std::fmax(std::fabs(s.min), std::fabs(s.max));
-        std::printf("channel %d: peak %.4f (%.2f dBFS), RMS %.4f (%.2f dBFS), DC offset %+.6f\n", c + 1, peak,
-                    static_cast<double>(s.peak_db), s.rms, static_cast<double>(s.rms_db), s.mean);
+        print_channel(c, std::fmax(std::fabs(s.min), std::fabs(s.max)), s.rms, s.mean);
     }
+    const double n = count > 0 ? static_cast<double>(count) : 1.0;
+    for (int c = stats.numChannels; c < VELMAUDIO_NumChannels(doc); ++c) {
+        float min = 0.0f, max = 0.0f;
+        if (count > 0 && !VELMAUDIO_GetChannelMinMax(doc, c, &min, &max)) return false;
+        print_channel(c, std::fmax(std::fabs(min), std::fabs(max)), std::sqrt(VELMAUDIO_GetChannelSamplesSum2(doc, c) / n),
+                      VELMAUDIO_GetChannelSamplesSum(doc, c) / n);
+    }
+    return true;
 }
 
 } // namespace
@@ -68,8 +91,8 @@ int run_info(int argc, char **argv)
     print_tag("album", VELMAUDIO_GetAlbumName(doc));
     print_tag("genre", VELMAUDIO_GetGenre(doc));
 
+    int64_t begin = 0, end = samples;
     if (args.from >= 0 || args.to >= 0) {
-        int64_t begin = 0, end = 0;
         if (!sample_range(doc, args.from, args.to, &begin, &end) || !VELMAUDIO_SelectAudio(doc, begin, end)) {
             std::fprintf(stderr, "velm: the range holds no samples\n");
             VELMAUDIO_Close(doc);
@@ -77,9 +100,7 @@ int run_info(int argc, char **argv)
         }
         std::printf("%-10s %.3f s .. %.3f s\n", "range", VELMAUDIO_SampleToTime(doc, begin), VELMAUDIO_SampleToTime(doc, end));
     }
-    AUDIOSIGNAL_STATISTICS stats{};
-    const int ok = VELMAUDIO_GetSignalStats(doc, &stats, 0.05, 0);
-    if (ok) print_channels(stats);
+    const bool ok = print_channels(doc, end - begin);
     VELMAUDIO_Close(doc);
     return ok ? 0 : 1;
 }

@@ -63,6 +63,22 @@ TEST(VelmTool, InfoMeasuresAFile)
     EXPECT_TRUE(r.has("peak 0.5000 (-6.02 dBFS), RMS 0.5000 (-6.02 dBFS), DC offset +0.500000")) << r.output;
 }
 
+TEST(VelmTool, InfoMeasuresEveryChannelOfAWideFile)
+{
+    velmtest::TempDir dir;
+    const std::string path = dir.file("eight.wav");
+    // Eight channels, channel k holding the constant k / 10.
+    std::vector<float> frames;
+    for (int i = 0; i < 4000; ++i)
+        for (int c = 1; c <= 8; ++c) frames.push_back(0.1f * static_cast<float>(c));
+    ASSERT_TRUE(velmtest::write_audio(path, frames, 8000, 8, SF_FORMAT_WAV | SF_FORMAT_FLOAT));
+    const ToolRun r = run_tool("info " + path);
+    ASSERT_EQ(r.status, 0) << r.output;
+    EXPECT_TRUE(r.has("channel 1: peak 0.1000 (-20.00 dBFS), RMS 0.1000 (-20.00 dBFS), DC offset +0.100000")) << r.output;
+    EXPECT_TRUE(r.has("channel 7: peak 0.7000 (-3.10 dBFS), RMS 0.7000 (-3.10 dBFS), DC offset +0.700000")) << r.output;
+    EXPECT_TRUE(r.has("channel 8: peak 0.8000 (-1.94 dBFS), RMS 0.8000 (-1.94 dBFS), DC offset +0.800000")) << r.output;
+}
+
 TEST(VelmTool, BadInputFailsWithAMessage)
 {
     velmtest::TempDir dir;
