@@ -5,9 +5,11 @@
 #include <QRect>
 #include <cmath>
 #include <cstdio>
+#include <cstring>
 #include <functional>
 #include <gtest/gtest.h>
 #include <limits>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -297,6 +299,33 @@ TEST(DrawCommonArguments, NullCanvasOrFontDrawsNothing)
         EXPECT_EQ(VELMDRAWCOMMON_DrawDisplayFrameWidth(c, nullptr, 0), 0);
     });
     EXPECT_TRUE(ink_box(image).isEmpty());
+}
+
+// A family name that fills its whole array without an ending NUL is read
+// no further than the array: the font is used with the name cut there.
+TEST(DrawCommonArguments, UnterminatedFamilyNameIsCutAtTheArrayEnd)
+{
+    VELMCONFIGFONT cut = test_font();
+    std::memset(cut.familyName, 'A', sizeof cut.familyName - 1);
+    cut.familyName[sizeof cut.familyName - 1] = '\0';
+    // On the heap, every byte set, so a read past the record is caught.
+    auto unterminated = std::make_unique<VELMCONFIGFONT>(cut);
+    std::memset(unterminated->familyName, 'A', sizeof unterminated->familyName);
+    unterminated->size = 20.1f;
+    unterminated->properties = 0x01010101;
+    unterminated->color = 0x011010FF;
+    unterminated->inactiveColor = 0x01FF1010;
+    std::memcpy(&cut.size, &unterminated->size, sizeof cut - sizeof cut.familyName);
+    int widths[2] = {};
+    const QImage expected = paint(300, 40, [&](VELMCANVAS c) {
+        widths[0] = VELMDRAWCOMMON_DrawDisplaySample(c, &cut, 0, kLeft, kTop, 123456);
+    });
+    const QImage got = paint(300, 40, [&](VELMCANVAS c) {
+        widths[1] = VELMDRAWCOMMON_DrawDisplaySample(c, unterminated.get(), 0, kLeft, kTop, 123456);
+    });
+    EXPECT_GT(widths[1], 0);
+    EXPECT_EQ(widths[1], widths[0]);
+    EXPECT_EQ(ink_box(got), ink_box(expected));
 }
 
 } // namespace

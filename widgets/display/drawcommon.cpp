@@ -29,7 +29,8 @@ struct Cells {
 void select_font(VELMCANVAS canvas, const VELMCONFIGFONT &config, float size)
 {
     _VELMCANVASFONT font{};
-    std::snprintf(font.name, sizeof font.name, "%s", config.familyName);
+    // The caller's name need not end inside its array.
+    std::snprintf(font.name, sizeof font.name, "%.*s", static_cast<int>(sizeof config.familyName), config.familyName);
     font.size = size;
     font.style = static_cast<uint32_t>(config.properties);
     VELMCANVAS_SelectFont(canvas, &font);
