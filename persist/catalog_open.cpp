@@ -3,6 +3,7 @@
 #include "persist/catalog_internal.hpp"
 #include "persist/velmdb.h"
 
+#include <chrono>
 #include <cstdio>
 #include <string>
 
@@ -80,17 +81,19 @@ bool is_sound_database(sqlite3 *db)
 
 // Readers and the writer no longer block each other; with the write-ahead
 // log, a crash may lose the last records but never damages the file.  The
-// switch needs the file to itself and SQLite does not wait for it (its busy
-// handler is not called there), so a second process opening a new catalogue
-// at the same moment retries for as long as it would wait for a write.
+// switch needs the file to itself.  Another connection's reader makes SQLite
+// wait in its busy handler, a writer makes it give up at once; either way a
+// second process opening a new catalogue at the same moment retries until
+// the time it would wait for a write has passed.
 bool use_write_ahead_log(sqlite3 *db)
 {
     constexpr int RETRY_MS = 5;
     const char *sql = "PRAGMA journal_mode=WAL;";
-    for (int waited = 0;; waited += RETRY_MS) {
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::milliseconds(BUSY_TIMEOUT_MS);
+    for (;;) {
         const int rc = sqlite3_exec(db, sql, nullptr, nullptr, nullptr);
         if (rc == SQLITE_OK) return true;
-        if ((rc != SQLITE_BUSY && rc != SQLITE_LOCKED) || waited >= BUSY_TIMEOUT_MS) {
+        if ((rc != SQLITE_BUSY && rc != SQLITE_LOCKED) || std::chrono::steady_clock::now() >= deadline) {
             BLDEBUG_Error(-1, "(VELMDB)_QueryDB: Error (%s) executing query (%s)", sqlite3_errmsg(db), sql);
             return false;
         }

@@ -64,6 +64,19 @@ TEST_F(BadCatalogTest, ADamagedCatalogueIsLeftAlone)
     expect_refused(database);
 }
 
+// The switch to the write-ahead log needs the file to itself: while another
+// program keeps reading the catalogue, the open gives up after the wait a
+// write would get, however many times it retried in between.
+TEST_F(BadCatalogTest, ACatalogueAnotherProgramKeepsReadingIsLeftAlone)
+{
+    Reader other(database);
+    ASSERT_TRUE(other.run("CREATE TABLE libvelm_velmdb_catalog (id INTEGER);"));
+    ASSERT_TRUE(other.run("BEGIN;"));
+    ASSERT_EQ(other.first("SELECT count(*) FROM libvelm_velmdb_catalog;"), "0");
+    expect_refused(database);
+    EXPECT_TRUE(other.run("COMMIT;"));
+}
+
 TEST_F(BadCatalogTest, AMissingFolderIsNotCreated)
 {
     const std::string missing = dir.file("no/such/folder/catalog.db");
