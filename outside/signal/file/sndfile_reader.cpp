@@ -144,21 +144,29 @@ private:
     // first frames must then read the same both ways before the direct path
     // is trusted.
     void enable_direct_reads(bool big_endian) {
-        if (sf_seek(sf_, 1, SEEK_SET) != 1) return;
-        int64_t second = vfile_.file_offset();
+        // A RIFF size that wrapped to less than a frame claims none: there is
+        // no second frame to find and nothing to compare, only the start.
+        const bool claims_none = frames_ == 0 && counts_in_32_bits_;
+        int64_t second = 0;
+        if (!claims_none) {
+            if (sf_seek(sf_, 1, SEEK_SET) != 1) return;
+            second = vfile_.file_offset();
+        }
         if (sf_seek(sf_, 0, SEEK_SET) != 0) return;
         next_ = 0;
         const int64_t start = vfile_.file_offset();
         auto direct = std::make_unique<DirectPcm>(fd_.get(), start, format_.audioFormatKind, format_.numChannels,
                                                   big_endian);
-        if (second - start != direct->bytes_per_frame()) return;
+        if (!claims_none && second - start != direct->bytes_per_frame()) return;
         // Now the length is known exactly: the frames after the first one.
         frames_ = std::min(frames_, (vfile_.file_size() - start) / direct->bytes_per_frame());
         int64_t n = std::min<int64_t>(frames_, 1024);
-        std::vector<float> theirs(static_cast<size_t>(n * format_.numChannels)), ours(theirs.size());
-        if (sf_readf_float(sf_, theirs.data(), n) != n || direct->read(0, ours.data(), n) != n) return;
-        next_ = n;
-        if (std::memcmp(theirs.data(), ours.data(), theirs.size() * sizeof(float)) != 0) return;
+        if (n > 0) {
+            std::vector<float> theirs(static_cast<size_t>(n * format_.numChannels)), ours(theirs.size());
+            if (sf_readf_float(sf_, theirs.data(), n) != n || direct->read(0, ours.data(), n) != n) return;
+            next_ = n;
+            if (std::memcmp(theirs.data(), ours.data(), theirs.size() * sizeof(float)) != 0) return;
+        }
         if (counts_in_32_bits_)
             frames_ = unwrapped_length(frames_, vfile_.file_size() - start, direct->bytes_per_frame());
         direct_ = std::move(direct);

@@ -179,6 +179,23 @@ TEST(Reader, WrappedWaveWithFramesThatDoNotDivideFourGigabytesKeepsItsLastFrame)
     EXPECT_FLOAT_EQ(got[1], -0.125f);
 }
 
+// Exactly 4 GB of samples: the wrapped size claims no frame at all.
+TEST(Reader, WrappedWaveThatClaimsNoFrameOpensWithItsWholeLength) {
+    TempDir dir;
+    const std::string path = dir.file("exact.wav");
+    const int64_t frames = int64_t{1} << 30;  // stereo 16-bit frames
+    const int16_t last[2] = {3000, -3000};
+    const auto *bytes = reinterpret_cast<const uint8_t *>(last);
+    write_wrapped_wave(path, 2, 16, frames * 4, std::vector<uint8_t>(bytes, bytes + sizeof last));
+    auto reader = open_reader(path.c_str(), "AUTO");
+    ASSERT_NE(reader, nullptr);
+    ASSERT_EQ(reader->frames(), frames);
+    float got[2] = {};
+    ASSERT_EQ(reader->read(frames - 1, got, 1), 1);
+    EXPECT_FLOAT_EQ(got[0], 3000 / 32768.0f);
+    EXPECT_FLOAT_EQ(got[1], -3000 / 32768.0f);
+}
+
 TEST(Reader, ReadsHeadlessFilesAsTheFormatStringSays) {
     TempDir dir;
     std::string path = dir.file("x.raw");
