@@ -208,7 +208,7 @@ AUDIO_API int AUDIO_CloseFile(AUDIO_FILE *file);
 
 /* Progress of the calling thread's long file work: opening a signal from a
  * file (AUDIOSIGNAL_OpenEx) and saving one (AUDIOSIGNAL_Save) call back with
- * the fraction done, rising in steps of at least a hundredth and ending with
+ * the fraction done, rising, at most once in each hundredth, and ending with
  * exactly 1.0 when the work succeeds.  The callback runs on the calling
  * thread, inside the call; null turns reporting off.  Returns 1. */
 typedef void (*AUDIO_PROGRESS_CALLBACK)(void *user, double fraction);
