@@ -190,8 +190,10 @@ uint32_t region(VELMDRAW d, uint32_t code, int x, int y)
 {
     const velm::view::RegionLayer &layer = d->regionLayer;
     if (!(code & kCustomTrack) || !layer.entries) return code;
+    // Later entries are drawn over earlier ones (children over their
+    // parents): the topmost region under the pointer is met first.
     const int count = std::min(layer.count, layer.capacity);
-    for (int r = 0; r < count; ++r) {
+    for (int r = count - 1; r >= 0; --r) {
         const velm::view::RegionEntry &entry = layer.entries[r];
         if (VELMAUDIO_IsRegionDeleted(d->document, entry.region)) continue;
         const auto index = static_cast<uint32_t>(r);

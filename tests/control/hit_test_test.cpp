@@ -13,6 +13,7 @@
 #include "edit/velmregion.h"
 #include "edit/velmselection.h"
 #include "render/view/drawer_internal.hpp"
+#include "render/view/velmoverlays.h"
 #include "render/view/view_support.hpp"
 #include "testaudio.hpp"
 #include "widgets/guiapp.h"
@@ -267,6 +268,31 @@ TEST_F(HitTest, RegionsInsideCustomTracks)
     EXPECT_EQ(at(t.left + 159, y), 0x48001u);
     EXPECT_EQ(at(t.left + 170, y), 0x8000u | static_cast<uint32_t>(track));
     drawer()->regionLayer = velm::view::RegionLayer{};
+}
+
+// A region nested in another is drawn over it, and it is the one the
+// pointer finds there.
+TEST_F(HitTest, NestedRegionIsFoundOverItsParent)
+{
+    AUDIOREGION *parent = VELMAUDIO_CreateRegionEx(doc, "words", 1000, 7000, "sentence", nullptr, VELMREGION_NO_UNDO);
+    AUDIOREGION *child = VELMAUDIO_CreateRegionEx(doc, "words", 3000, 5000, "word", nullptr, VELMREGION_NO_UNDO);
+    ASSERT_TRUE(parent && child);
+    ASSERT_TRUE(AUDIOREGION_SetParent(child, parent));
+    VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
+    draw(kBothKindsNavigator);
+    _VELMRECT inner{}, outer{};
+    ASSERT_TRUE(VELMAUDIO_GetRegionDrawRect(doc, child, &inner));
+    ASSERT_TRUE(VELMAUDIO_GetRegionDrawRect(doc, parent, &outer));
+    const velm::view::RegionLayer &layer = drawer()->regionLayer;
+    auto region_at = [&](int x, int y) -> const AUDIOREGION * {
+        const uint32_t code = at(x, y);
+        const auto index = static_cast<int>(code & 0xFFFu);
+        if (!(code & 0x70000u) || index >= layer.count) return nullptr;
+        return layer.entries[index].region;
+    };
+    EXPECT_EQ(region_at(mid_x(inner), mid_y(inner)), child);
+    EXPECT_EQ(region_at(inner.left, mid_y(inner)), child);
+    EXPECT_EQ(region_at(outer.left + 20, mid_y(outer)), parent);
 }
 
 TEST_F(HitTest, ZoomLimitZonesAndHandles)
