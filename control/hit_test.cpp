@@ -191,8 +191,9 @@ uint32_t region(VELMDRAW d, uint32_t code, int x, int y)
     const velm::view::RegionLayer &layer = d->regionLayer;
     if (!(code & kCustomTrack) || !layer.entries) return code;
     // Later entries are drawn over earlier ones (children over their
-    // parents): the topmost region under the pointer is met first.
-    const int count = std::min(layer.count, layer.capacity);
+    // parents): the topmost region under the pointer is met first.  Only
+    // the entries that the code's index bits can name take part.
+    const int count = std::min({layer.count, layer.capacity, static_cast<int>(kIndexBits) + 1});
     for (int r = count - 1; r >= 0; --r) {
         const velm::view::RegionEntry &entry = layer.entries[r];
         if (VELMAUDIO_IsRegionDeleted(d->document, entry.region)) continue;

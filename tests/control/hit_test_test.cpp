@@ -295,6 +295,33 @@ TEST_F(HitTest, NestedRegionIsFoundOverItsParent)
     EXPECT_EQ(region_at(outer.left + 20, mid_y(outer)), parent);
 }
 
+// The code holds 12 bits of entry index: a region past them must not be
+// reported as another one.
+TEST_F(HitTest, RegionCodeNeverNamesAnotherRegion)
+{
+    constexpr int kRegions = 4200;
+    for (int i = 0; i < kRegions; ++i)
+        ASSERT_NE(VELMAUDIO_CreateRegionEx(doc, "words", i, i + 1, nullptr, nullptr, VELMREGION_NO_UNDO), nullptr);
+    VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
+    draw(kBothKindsNavigator);
+    const velm::view::RegionLayer &layer = drawer()->regionLayer;
+    ASSERT_EQ(layer.count, kRegions);
+    const int words = VELMAUDIO_FindCustomTrackId(doc, "words");
+    const _VELMRECT &t = drawer()->trackAreas[static_cast<size_t>(words)];
+    const int y = mid_y(t);
+    int found = 0;
+    for (int x = t.left; x <= t.right; ++x) {
+        const uint32_t code = at(x, y);
+        if (!(code & 0x70000u)) continue;
+        ++found;
+        const auto index = static_cast<int>(code & 0xFFFu);
+        ASSERT_LT(index, layer.count) << x;
+        const _VELMRECT &area = layer.entries[index].area;
+        EXPECT_TRUE(x >= area.left && x <= area.right) << x << " names entry " << index;
+    }
+    EXPECT_GT(found, 0);
+}
+
 TEST_F(HitTest, ZoomLimitZonesAndHandles)
 {
     const _VELMRECT &a = lane(0).area;
