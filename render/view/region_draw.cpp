@@ -28,6 +28,29 @@ uint32_t text_flags(uint32_t options, bool label)
     return align | ((options & VELMTRACK_ALLOWPARTIALTEXT) ? VELMCANVASTEXT_ELLIPSIS : 0u);
 }
 
+// The box of a region's text, 8 columns in from its true ends.  A region
+// reaching far beyond both sides of the display loses the same number of
+// columns at each end, so that centred text stays on its true middle;
+// whatever still lies beyond is cut where no text can show.
+bool text_box(VELMDRAW d, const RegionEntry &e, _VELMRECT *box)
+{
+    constexpr double kFar = 2.0 * kOffViewColumns;
+    double from = 0.0, to = 0.0;
+    region_columns(d, e.begin, e.end, &from, &to);
+    // Beyond this the text is out of sight whatever its alignment.
+    constexpr double kLimit = 1e15;
+    int64_t left = d->display.left + static_cast<int64_t>(std::clamp(from, -kLimit, kLimit)) + 8;
+    int64_t right = d->display.left + static_cast<int64_t>(std::clamp(to, -kLimit, kLimit)) - 8;
+    const auto reach = static_cast<int64_t>(kOffViewColumns);
+    const int64_t cut = std::min(std::max<int64_t>(0, d->display.left - reach - left),
+                                 std::max<int64_t>(0, right - d->display.right - reach));
+    left = std::max<int64_t>(left + cut, d->display.left - static_cast<int64_t>(kFar));
+    right = std::min<int64_t>(right - cut, d->display.right + static_cast<int64_t>(kFar));
+    if (right < left) return false;
+    *box = make_rect(static_cast<int32_t>(left), e.area.top + 2, static_cast<int32_t>(right - left + 1), e.area.height - 4);
+    return true;
+}
+
 // The label or the comment, as the track's options choose, inside the region.
 void draw_region_text(VELMDRAW d, const RegionEntry &e, int track, uint32_t options)
 {
@@ -38,8 +61,8 @@ void draw_region_text(VELMDRAW d, const RegionEntry &e, int track, uint32_t opti
     const bool label = which == VELMTRACK_SHOWRGNLABEL;
     if (!label && which != VELMTRACK_SHOWRGNCOMMENT) return;
     const char *text = label ? AUDIOREGION_GetLabel(e.region) : AUDIOREGION_GetComment(e.region);
-    const _VELMRECT box = make_rect(e.area.left + 8, e.area.top + 2, e.area.width - 16, e.area.height - 4);
-    if (!text || !*text || box.width <= 0 || box.height <= 0) return;
+    _VELMRECT box{};
+    if (!text || !*text || !text_box(d, e, &box) || box.height <= 0) return;
     VELMCONFIGFONT config;
     const _VELMCANVASFONT font = canvas_font(*VELMDRAW_GetCustomTrackFont(d, track, &config));
     VELMCANVAS_SelectFont(d->canvas, &font);

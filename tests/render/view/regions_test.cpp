@@ -35,7 +35,7 @@ class RegionView : public ::testing::Test {
 protected:
     void SetUp() override
     {
-        doc = viewtest::open_audio(dir.file("speech.wav"), viewtest::speech_like(kRate, 1, 2.0), kRate, 1);
+        doc = viewtest::open_audio(dir.file("speech.wav"), viewtest::speech_like(kRate, 1, seconds()), kRate, 1);
         ASSERT_NE(doc, nullptr);
         words = VELMAUDIO_AddCustomTrack(doc, "words");
         ASSERT_GT(words, 0);
@@ -50,6 +50,7 @@ protected:
     {
         if (doc) VELMAUDIO_Close(doc);
     }
+    virtual double seconds() const { return 2.0; }
 
     void track_setting(const char *track, const char *key, int value)
     {
@@ -338,6 +339,38 @@ TEST_F(RegionView, ScrollingRegionsEqualsAFullRedraw)
         VELMSTATE_NotifyChanges(doc, 0);
         EXPECT_EQ(viewtest::count_differences(image, draw(direct, flags)), 0) << start;
     }
+}
+
+// A long recording zoomed in to a few samples: its one region reaches
+// millions of columns beyond both sides of the display.
+class LongRegionView : public RegionView {
+protected:
+    double seconds() const override { return 20.0; }
+};
+
+TEST_F(LongRegionView, TextOfARegionFarWiderThanTheViewScrollsWithIt)
+{
+    track_options("words", "SHOWRGNLABEL");
+    add("words", 0, 20 * kRate, "whole recording");
+    const int64_t middle = 10 * kRate;
+    viewtest::Canvas scrolled(kWidth, kHeight), direct(kWidth, kHeight);
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, middle - 2, middle + 2));
+    const QImage centred = draw(scrolled, kView);
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, middle - 1, middle + 3));
+    const QImage image = draw(scrolled, kView);
+    VELMSTATE_NotifyChanges(doc, 0);
+    const QImage full = draw(direct, kView);
+    // The label moved with the region, and the scrolled picture of the
+    // track is the one a full redraw gives.
+    const _VELMRECT &a = track_area(words);
+    long moved = 0, differences = 0;
+    for (int y = a.top; y <= a.bottom; ++y)
+        for (int x = a.left; x <= a.right; ++x) {
+            if (centred.pixel(x, y) != image.pixel(x, y)) ++moved;
+            if (image.pixel(x, y) != full.pixel(x, y)) ++differences;
+        }
+    EXPECT_GT(moved, 0);
+    EXPECT_EQ(differences, 0);
 }
 
 TEST_F(RegionView, HeldRegionTintsItsColumnsOverTheLanes)
