@@ -12,6 +12,7 @@
 #include "edit/velmcustomtrack.h"
 #include "edit/velmedit.h"
 #include "edit/velmregion.h"
+#include "edit/velmselection.h"
 #include "render/view/drawer_internal.hpp"
 #include "render/view/velmoverlays.h"
 #include "testaudio.hpp"
@@ -272,11 +273,11 @@ protected:
         EXPECT_EQ(viewtest::count_differences(after, draw(fresh, flags)), 0);
         return dirty;
     }
-    // Only the tracks and the shadows around them.
-    void expect_tracks_only(const _VELMRECT &dirty)
+    // No full redraw: the lanes' top row and the frame above stay untouched.
+    void expect_partial(const _VELMRECT &dirty)
     {
         EXPECT_GT(dirty.height, 0);
-        EXPECT_GE(dirty.top, track_area(0).top - 7);
+        EXPECT_GE(dirty.top, doc->renderer->lanesArea.top - 1);
     }
 
     AUDIOREGION *moving = nullptr, *still = nullptr, *below = nullptr;
@@ -285,19 +286,39 @@ protected:
 TEST_F(ChangedRegion, OffsetFocusedRegion)
 {
     const int64_t end = AUDIOREGION_EndSample(moving);
-    expect_tracks_only(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_OffsetRegions(doc, 2500)); }));
+    expect_partial(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_OffsetRegions(doc, 2500)); }));
     EXPECT_EQ(AUDIOREGION_EndSample(moving), end + 2500);
 }
 
 TEST_F(ChangedRegion, LongerFocusedRegion)
 {
-    expect_tracks_only(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, moving, 1.0, 0)); }));
+    expect_partial(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, moving, 1.0, 0)); }));
 }
 
 TEST_F(ChangedRegion, EdgeOfAnotherRegion)
 {
-    expect_tracks_only(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionBegin(doc, still, 1.0, 0)); }));
+    expect_partial(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionBegin(doc, still, 1.0, 0)); }));
     EXPECT_EQ(AUDIOREGION_BeginSample(still), kRate);
+}
+
+// The selections lie over the tracks too; the redrawn columns keep them.
+TEST_F(ChangedRegion, SelectionOverTheTracksStays)
+{
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 6000, 16000));
+    expect_partial(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_OffsetRegions(doc, 2500)); }));
+}
+
+// A held region's tint over the lanes follows it as it is dragged.
+TEST_F(ChangedRegion, TintOfTheHeldRegionFollowsIt)
+{
+    viewtest::Canvas first(kWidth, kHeight);
+    draw(first, kView); // the renderer, and with it the controller, exist from the first draw
+    VELMSTATE_NotifyChanges(doc, 0);
+    velm::control::Interaction &control = doc->renderer->control;
+    control.buttonReleased = 0;
+    control.dragState = velm::control::kMovingRegions;
+    expect_partial(redraw_after(kView, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, moving, 1.0, 0)); }));
+    control = velm::control::Interaction{};
 }
 
 // A change of the samples that asked for no redraw of its own, then a region
