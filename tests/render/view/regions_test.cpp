@@ -321,6 +321,13 @@ TEST_F(ChangedRegion, TintOfTheHeldRegionFollowsIt)
     control = velm::control::Interaction{};
 }
 
+// A transparent view still paints the tracks' backgrounds: a moved region
+// leaves nothing behind.
+TEST_F(ChangedRegion, MovedRegionInATransparentView)
+{
+    expect_partial(redraw_after(kView | 0x1000000, [&] { ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(doc, moving, 0.5, 0)); }));
+}
+
 // A change of the samples that asked for no redraw of its own, then a region
 // change: the frame must not take the regions-only path.
 TEST_F(ChangedRegion, SamplesChangedJustBeforeAreRedrawnToo)
