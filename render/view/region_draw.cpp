@@ -4,8 +4,8 @@
 #include <algorithm>
 #include <vector>
 
-#include "core/document_internal.hpp"
 #include "control/velmcontrol.h"
+#include "core/document_internal.hpp"
 #include "core/velmaudio.h"
 #include "edit/velmcustomtrack.h"
 #include "render/view/overlay_internal.hpp"
