@@ -189,7 +189,7 @@ uint32_t custom_track(VELMDRAW d, uint32_t code, int x, int y)
 uint32_t region(VELMDRAW d, uint32_t code, int x, int y)
 {
     const velm::view::RegionLayer &layer = d->regionLayer;
-    if (!(code & kCustomTrack) || !layer.entries) return code;
+    if (!(code & kCustomTrack) || !layer.names_regions_of(d->document->signal)) return code;
     // Later entries are drawn over earlier ones (children over their
     // parents): the topmost region under the pointer is met first.  Only
     // the entries that the code's index bits can name take part.

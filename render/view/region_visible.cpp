@@ -78,8 +78,8 @@ bool area_from_region(VELMDRAW d, const AUDIOREGION *region, int default_track, 
 
 const RegionEntry *find_entry(const _VELMDRAW *d, const AUDIOREGION *region)
 {
-    if (!region) return nullptr;
     const RegionLayer &layer = d->regionLayer;
+    if (!region || !layer.names_regions_of(d->document->signal)) return nullptr;
     for (int i = 0; i < layer.count; ++i) {
         const RegionEntry &e = layer.entries[i];
         if (e.region == region || (region->identity && e.region == region->identity)) return &e;
@@ -130,6 +130,7 @@ bool keep_entries(VELMDRAW d, const std::vector<RegionEntry> &entries)
     if (!reserve_entries(d, static_cast<int>(entries.size()))) return false;
     std::copy(entries.begin(), entries.end(), layer.entries);
     layer.count = static_cast<int32_t>(entries.size());
+    layer.signal = d->document->signal;
     return true;
 }
 

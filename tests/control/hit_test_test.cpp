@@ -322,6 +322,24 @@ TEST_F(HitTest, RegionCodeNeverNamesAnotherRegion)
     EXPECT_GT(found, 0);
 }
 
+// Reverting to the saved file replaces the signal and its regions; until
+// the next frame the pointer finds no region where the old ones were drawn.
+TEST_F(HitTest, NoRegionFromARevertedSignal)
+{
+    AUDIOREGION *region = VELMAUDIO_CreateRegionEx(doc, "words", 1000, 5000, "unsaved", nullptr, VELMREGION_NO_UNDO);
+    ASSERT_NE(region, nullptr);
+    VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
+    draw(kBothKindsNavigator);
+    _VELMRECT r{};
+    ASSERT_TRUE(VELMAUDIO_GetRegionDrawRect(doc, region, &r));
+    const int x = mid_x(r), y = mid_y(r);
+    EXPECT_EQ(at(x, y) & 0x70000u, 0x10000u);
+    ASSERT_TRUE(VELMAUDIO_RevertToSaved(doc));
+    EXPECT_EQ(at(x, y) & 0x70000u, 0u);
+    draw(kBothKindsNavigator);
+    EXPECT_EQ(at(x, y) & 0x70000u, 0u);
+}
+
 TEST_F(HitTest, ZoomLimitZonesAndHandles)
 {
     const _VELMRECT &a = lane(0).area;
