@@ -189,9 +189,12 @@ uint32_t custom_track(VELMDRAW d, uint32_t code, int x, int y)
 uint32_t region(VELMDRAW d, uint32_t code, int x, int y)
 {
     const velm::view::RegionLayer &layer = d->regionLayer;
-    if (!(code & kCustomTrack) || !layer.entries) return code;
-    const int count = std::min(layer.count, layer.capacity);
-    for (int r = 0; r < count; ++r) {
+    if (!(code & kCustomTrack) || !layer.names_regions_of(d->document->signal)) return code;
+    // Later entries are drawn over earlier ones (children over their
+    // parents): the topmost region under the pointer is met first.  Only
+    // the entries that the code's index bits can name take part.
+    const int count = std::min({layer.count, layer.capacity, static_cast<int>(kIndexBits) + 1});
+    for (int r = count - 1; r >= 0; --r) {
         const velm::view::RegionEntry &entry = layer.entries[r];
         if (VELMAUDIO_IsRegionDeleted(d->document, entry.region)) continue;
         const auto index = static_cast<uint32_t>(r);

@@ -45,7 +45,9 @@ void fill_track(VELMDRAW d, const _VELMRECT &a, int x, int width, uint32_t optio
 int VELMDRAW_DrawCustomCanvas(VELMDRAW d, int first, int last)
 {
     if (!d || !d->canvas || !d->state) return 0;
-    if (d->state->viewFlags & 0x1000000u) return 1;
+    // A transparent view keeps the tracks' backgrounds: they are what clears
+    // a track before its regions are drawn again.
+    if (d->state->viewFlags & 0x800u) return 1;
     for (int t = 0; t < VELM_MAX_CUSTOM_TRACKS; ++t) {
         if (!d->trackShown[static_cast<size_t>(t)]) continue;
         if (!BLNOTIFY_SendEvent(d->document->dispatcher, nullptr, 0, 0x20050, nullptr, nullptr)) continue;

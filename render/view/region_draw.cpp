@@ -4,9 +4,11 @@
 #include <algorithm>
 #include <vector>
 
+#include "control/velmcontrol.h"
 #include "core/document_internal.hpp"
 #include "core/velmaudio.h"
 #include "edit/velmcustomtrack.h"
+#include "render/view/overlay_internal.hpp"
 #include "render/view/region_internal.hpp"
 #include "render/view/velmoverlays.h"
 
@@ -28,6 +30,29 @@ uint32_t text_flags(uint32_t options, bool label)
     return align | ((options & VELMTRACK_ALLOWPARTIALTEXT) ? VELMCANVASTEXT_ELLIPSIS : 0u);
 }
 
+// The box of a region's text, 8 columns in from its true ends.  A region
+// reaching far beyond both sides of the display loses the same number of
+// columns at each end, so that centred text stays on its true middle;
+// whatever still lies beyond is cut where no text can show.
+bool text_box(VELMDRAW d, const RegionEntry &e, _VELMRECT *box)
+{
+    constexpr double kFar = 2.0 * kOffViewColumns;
+    double from = 0.0, to = 0.0;
+    region_columns(d, e.begin, e.end, &from, &to);
+    // Beyond this the text is out of sight whatever its alignment.
+    constexpr double kLimit = 1e15;
+    int64_t left = d->display.left + static_cast<int64_t>(std::clamp(from, -kLimit, kLimit)) + 8;
+    int64_t right = d->display.left + static_cast<int64_t>(std::clamp(to, -kLimit, kLimit)) - 8;
+    const auto reach = static_cast<int64_t>(kOffViewColumns);
+    const int64_t cut = std::min(std::max<int64_t>(0, d->display.left - reach - left),
+                                 std::max<int64_t>(0, right - d->display.right - reach));
+    left = std::max<int64_t>(left + cut, d->display.left - static_cast<int64_t>(kFar));
+    right = std::min<int64_t>(right - cut, d->display.right + static_cast<int64_t>(kFar));
+    if (right < left) return false;
+    *box = make_rect(static_cast<int32_t>(left), e.area.top + 2, static_cast<int32_t>(right - left + 1), e.area.height - 4);
+    return true;
+}
+
 // The label or the comment, as the track's options choose, inside the region.
 void draw_region_text(VELMDRAW d, const RegionEntry &e, int track, uint32_t options)
 {
@@ -38,8 +63,8 @@ void draw_region_text(VELMDRAW d, const RegionEntry &e, int track, uint32_t opti
     const bool label = which == VELMTRACK_SHOWRGNLABEL;
     if (!label && which != VELMTRACK_SHOWRGNCOMMENT) return;
     const char *text = label ? AUDIOREGION_GetLabel(e.region) : AUDIOREGION_GetComment(e.region);
-    const _VELMRECT box = make_rect(e.area.left + 8, e.area.top + 2, e.area.width - 16, e.area.height - 4);
-    if (!text || !*text || box.width <= 0 || box.height <= 0) return;
+    _VELMRECT box{};
+    if (!text || !*text || !text_box(d, e, &box) || box.height <= 0) return;
     VELMCONFIGFONT config;
     const _VELMCANVASFONT font = canvas_font(*VELMDRAW_GetCustomTrackFont(d, track, &config));
     VELMCANVAS_SelectFont(d->canvas, &font);
@@ -153,23 +178,49 @@ int VELMDRAW_UpdateChangedRegion(VELMDRAW d, const VELMREGIONCOPY *changed)
     const RegionChange change = changed_regions(d, now);
     if (change.lanes) return -1;
     const _VELMRECT band = track_band(d);
-    const int first = std::max(change.left - 1 - d->display.left, 0);
-    const int last = std::min(change.right + 1 - d->display.left, d->columns - 1);
-    if (!change.any() || band.height <= 0 || last < first) return keep_entries(d, now) ? 1 : 0;
+    int first = std::max(change.left - 1 - d->display.left, 0);
+    int last = std::min(change.right + 1 - d->display.left, d->columns - 1);
+    const bool tracks = change.any() && band.height > 0 && first <= last;
 
     VELMCANVAS c = d->canvas;
-    VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_MEMORY);
-    // The backgrounds span the lanes too: keep them to the tracks.
-    const _VELMRECT clip = make_rect(d->display.left + first, band.top, last - first + 1, band.height);
-    VELMCANVAS_SetDrawArea(c, &clip);
-    int ok = VELMDRAW_DrawCanvas(d, first, last);
-    if (const auto grids = draw_hooks().scaleGrids) ok &= grids(d, first, last);
-    VELMCANVAS_ClearDrawArea(c);
-    ok &= keep_entries(d, now) ? 1 : 0;
-    ok &= VELMDRAW_DrawCustomTrackRegions(d, first, last);
-    ok &= VELMCANVAS_MoveBlock2(c, VELMCANVASTARGET_MEMORY, clip.left, clip.top, clip.width, clip.height,
-                                VELMCANVASTARGET_OUTPUT, clip.left, clip.top);
+    int ok = 1;
+    if (tracks) {
+        VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_MEMORY);
+        // The backgrounds span the lanes too: keep them to the tracks.
+        const _VELMRECT clip = make_rect(d->display.left + first, band.top, last - first + 1, band.height);
+        VELMCANVAS_SetDrawArea(c, &clip);
+        ok &= VELMDRAW_DrawCanvas(d, first, last);
+        if (const auto grids = draw_hooks().scaleGrids) ok &= grids(d, first, last);
+        VELMCANVAS_ClearDrawArea(c);
+        ok &= keep_entries(d, now) ? 1 : 0;
+        ok &= VELMDRAW_DrawCustomTrackRegions(d, first, last);
+    } else {
+        ok &= keep_entries(d, now) ? 1 : 0;
+        first = d->columns;
+        last = -1;
+    }
+
+    // The output holds what is drawn over the slow picture: the held
+    // region's tint (erased with the overlays at the start of the frame)
+    // and the selections, over the lanes and the tracks.  Those columns are
+    // copied from memory and drawn over again.
+    RegionEntry held;
+    if (VELMCONTROL_IsGrabbingRegion(d) && d->state->focusedRegion.region &&
+        area_from_region(d, static_cast<const AUDIOREGION *>(d->state->focusedRegion.region),
+                         VELMAUDIO_FindCustomTrackId(d->document, "default"), &held)) {
+        first = std::max(std::min(first, held.area.left - 1 - d->display.left), 0);
+        last = std::min(std::max(last, held.area.right + 1 - d->display.left), d->columns - 1);
+    }
+    if (last < first) return ok;
+    // The tint's edge lines reach one row above the lanes.
+    const int32_t top = d->lanesArea.top - 1;
+    const int32_t bottom = std::max(band.height > 0 ? band.bottom : top, d->lanesArea.bottom + 1);
+    const _VELMRECT columns = make_rect(d->display.left + first, top, last - first + 1, bottom - top + 1);
+    ok &= VELMCANVAS_MoveBlock2(c, VELMCANVASTARGET_MEMORY, columns.left, columns.top, columns.width, columns.height,
+                                VELMCANVASTARGET_OUTPUT, columns.left, columns.top);
     VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_OUTPUT);
-    mark_dirty(d, clip.left, clip.top, clip.right, clip.bottom);
+    mark_dirty(d, columns.left, columns.top, columns.right, columns.bottom);
+    ok &= VELMDRAW_DrawRegionOnFocus(d, first, last);
+    ok &= draw_selection_list(d, d->state, first, last);
     return ok;
 }

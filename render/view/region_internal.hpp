@@ -10,6 +10,15 @@
 
 namespace velm::view {
 
+// A region running out of view keeps its true extent (its text stays
+// centred on the whole region as it scrolls), up to this many columns beyond
+// either end of the display, which keeps coordinates well inside 32 bits.
+constexpr double kOffViewColumns = 1 << 24;
+
+// The display columns a region covers: from its begin sample's column to
+// the column of its last sample.
+void region_columns(VELMDRAW drawer, double begin, double end, double *from, double *to);
+
 // The region's entry as it would be listed now: its columns on its track's
 // area (the lanes' rows for a hidden "default" track).  False when the region
 // lies outside the view or its track is not drawn.

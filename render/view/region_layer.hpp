@@ -25,6 +25,12 @@ struct RegionLayer {
     RegionEntry *entries = nullptr;  // in the drawer's pool
     int32_t capacity = 0;
     int32_t count = 0;
+    // The signal that owns the listed regions.  Once the document holds
+    // another one, the old regions may be freed: the entries name nothing
+    // until the list is rebuilt.
+    const AUDIOSIGNAL *signal = nullptr;
+
+    bool names_regions_of(const AUDIOSIGNAL *current) const { return entries && signal == current; }
 };
 
 } // namespace velm::view

@@ -64,7 +64,8 @@ int VELMDRAW_DrawCustomTrackRegionShadows(VELMDRAW d)
     if (!d || !d->canvas || !d->state || !d->laidOut) return 0;
     const _VELMRECT band = track_band(d);
     const RegionLayer &layer = d->regionLayer;
-    if (band.height <= 0 || band.width <= 0 || layer.count == 0) return 1;
+    if (band.height <= 0 || band.width <= 0 || layer.count == 0 || !layer.names_regions_of(d->document->signal))
+        return 1;
     VELMCANVAS c = d->canvas;
     const _VELMRECT area = make_rect(band.left, band.top - kShadowReach, band.width, band.height + 2 * kShadowReach);
     VELMCANVAS_SaveOverlayRect(c, &area);

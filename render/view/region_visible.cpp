@@ -15,10 +15,6 @@ using namespace velm::view;
 
 namespace {
 
-// A region running out of view keeps its true extent (its text stays
-// centred on the whole region as it scrolls), up to this many columns beyond
-// either end of the display, which keeps coordinates well inside 32 bits.
-constexpr double kOffViewColumns = 1 << 24;
 // Nesting deeper than this is drawn as if it were this deep.
 constexpr int kMaxDepth = 16;
 
@@ -48,6 +44,14 @@ bool reserve_entries(VELMDRAW d, int count)
 
 namespace velm::view {
 
+void region_columns(VELMDRAW d, double begin, double end, double *from, double *to)
+{
+    // Column c shows the samples from positions[c] up to positions[c + 1];
+    // the end sample is the first one after the region.
+    *from = std::floor(VELMDRAW_ConvertRealXtoDisplayX(d, begin));
+    *to = std::max(*from, std::ceil(VELMDRAW_ConvertRealXtoDisplayX(d, end)) - 1.0);
+}
+
 bool area_from_region(VELMDRAW d, const AUDIOREGION *region, int default_track, RegionEntry *entry)
 {
     const int track = AUDIOREGION_GetTrackId(region);
@@ -57,10 +61,8 @@ bool area_from_region(VELMDRAW d, const AUDIOREGION *region, int default_track, 
     if (!shown && !on_default) return false;
     const double begin = static_cast<double>(AUDIOREGION_BeginSample(region));
     const double end = static_cast<double>(AUDIOREGION_EndSample(region));
-    // Column c shows the samples from positions[c] up to positions[c + 1];
-    // the end sample is the first one after the region.
-    const double from = std::floor(VELMDRAW_ConvertRealXtoDisplayX(d, begin));
-    const double to = std::max(from, std::ceil(VELMDRAW_ConvertRealXtoDisplayX(d, end)) - 1.0);
+    double from = 0.0, to = 0.0;
+    region_columns(d, begin, end, &from, &to);
     const double columns = d->columns;
     if (to < 0.0 || from > columns - 1.0) return false;
     const int x0 = static_cast<int>(std::max(from, -kOffViewColumns));
@@ -76,8 +78,8 @@ bool area_from_region(VELMDRAW d, const AUDIOREGION *region, int default_track, 
 
 const RegionEntry *find_entry(const _VELMDRAW *d, const AUDIOREGION *region)
 {
-    if (!region) return nullptr;
     const RegionLayer &layer = d->regionLayer;
+    if (!region || !layer.names_regions_of(d->document->signal)) return nullptr;
     for (int i = 0; i < layer.count; ++i) {
         const RegionEntry &e = layer.entries[i];
         if (e.region == region || (region->identity && e.region == region->identity)) return &e;
@@ -128,6 +130,7 @@ bool keep_entries(VELMDRAW d, const std::vector<RegionEntry> &entries)
     if (!reserve_entries(d, static_cast<int>(entries.size()))) return false;
     std::copy(entries.begin(), entries.end(), layer.entries);
     layer.count = static_cast<int32_t>(entries.size());
+    layer.signal = d->document->signal;
     return true;
 }
 

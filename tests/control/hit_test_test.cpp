@@ -13,6 +13,7 @@
 #include "edit/velmregion.h"
 #include "edit/velmselection.h"
 #include "render/view/drawer_internal.hpp"
+#include "render/view/velmoverlays.h"
 #include "render/view/view_support.hpp"
 #include "testaudio.hpp"
 #include "widgets/guiapp.h"
@@ -267,6 +268,76 @@ TEST_F(HitTest, RegionsInsideCustomTracks)
     EXPECT_EQ(at(t.left + 159, y), 0x48001u);
     EXPECT_EQ(at(t.left + 170, y), 0x8000u | static_cast<uint32_t>(track));
     drawer()->regionLayer = velm::view::RegionLayer{};
+}
+
+// A region nested in another is drawn over it, and it is the one the
+// pointer finds there.
+TEST_F(HitTest, NestedRegionIsFoundOverItsParent)
+{
+    AUDIOREGION *parent = VELMAUDIO_CreateRegionEx(doc, "words", 1000, 7000, "sentence", nullptr, VELMREGION_NO_UNDO);
+    AUDIOREGION *child = VELMAUDIO_CreateRegionEx(doc, "words", 3000, 5000, "word", nullptr, VELMREGION_NO_UNDO);
+    ASSERT_TRUE(parent && child);
+    ASSERT_TRUE(AUDIOREGION_SetParent(child, parent));
+    VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
+    draw(kBothKindsNavigator);
+    _VELMRECT inner{}, outer{};
+    ASSERT_TRUE(VELMAUDIO_GetRegionDrawRect(doc, child, &inner));
+    ASSERT_TRUE(VELMAUDIO_GetRegionDrawRect(doc, parent, &outer));
+    const velm::view::RegionLayer &layer = drawer()->regionLayer;
+    auto region_at = [&](int x, int y) -> const AUDIOREGION * {
+        const uint32_t code = at(x, y);
+        const auto index = static_cast<int>(code & 0xFFFu);
+        if (!(code & 0x70000u) || index >= layer.count) return nullptr;
+        return layer.entries[index].region;
+    };
+    EXPECT_EQ(region_at(mid_x(inner), mid_y(inner)), child);
+    EXPECT_EQ(region_at(inner.left, mid_y(inner)), child);
+    EXPECT_EQ(region_at(outer.left + 20, mid_y(outer)), parent);
+}
+
+// The code holds 12 bits of entry index: a region past them must not be
+// reported as another one.
+TEST_F(HitTest, RegionCodeNeverNamesAnotherRegion)
+{
+    constexpr int kRegions = 4200;
+    for (int i = 0; i < kRegions; ++i)
+        ASSERT_NE(VELMAUDIO_CreateRegionEx(doc, "words", i, i + 1, nullptr, nullptr, VELMREGION_NO_UNDO), nullptr);
+    VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
+    draw(kBothKindsNavigator);
+    const velm::view::RegionLayer &layer = drawer()->regionLayer;
+    ASSERT_EQ(layer.count, kRegions);
+    const int words = VELMAUDIO_FindCustomTrackId(doc, "words");
+    const _VELMRECT &t = drawer()->trackAreas[static_cast<size_t>(words)];
+    const int y = mid_y(t);
+    int found = 0;
+    for (int x = t.left; x <= t.right; ++x) {
+        const uint32_t code = at(x, y);
+        if (!(code & 0x70000u)) continue;
+        ++found;
+        const auto index = static_cast<int>(code & 0xFFFu);
+        ASSERT_LT(index, layer.count) << x;
+        const _VELMRECT &area = layer.entries[index].area;
+        EXPECT_TRUE(x >= area.left && x <= area.right) << x << " names entry " << index;
+    }
+    EXPECT_GT(found, 0);
+}
+
+// Reverting to the saved file replaces the signal and its regions; until
+// the next frame the pointer finds no region where the old ones were drawn.
+TEST_F(HitTest, NoRegionFromARevertedSignal)
+{
+    AUDIOREGION *region = VELMAUDIO_CreateRegionEx(doc, "words", 1000, 5000, "unsaved", nullptr, VELMREGION_NO_UNDO);
+    ASSERT_NE(region, nullptr);
+    VELMSTATE_NotifyChanges(doc, VELMSTATE_CHANGE_EVERYTHING);
+    draw(kBothKindsNavigator);
+    _VELMRECT r{};
+    ASSERT_TRUE(VELMAUDIO_GetRegionDrawRect(doc, region, &r));
+    const int x = mid_x(r), y = mid_y(r);
+    EXPECT_EQ(at(x, y) & 0x70000u, 0x10000u);
+    ASSERT_TRUE(VELMAUDIO_RevertToSaved(doc));
+    EXPECT_EQ(at(x, y) & 0x70000u, 0u);
+    draw(kBothKindsNavigator);
+    EXPECT_EQ(at(x, y) & 0x70000u, 0u);
 }
 
 TEST_F(HitTest, ZoomLimitZonesAndHandles)
