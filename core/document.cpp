@@ -378,6 +378,11 @@ int VELMAUDIO_RevertToSaved(VELMAUDIO doc)
     if (!fresh) return 0;
     AUDIOSIGNAL *old = VELMAUDIO_SetAudioSignal(doc, fresh);
     if (is_settings_document(fresh)) bind_settings_to_file(doc, true);
+    // The history and the region snapshots were written against the dropped
+    // signal: its block lists and region records.  None of it applies to the
+    // file as saved, and undoing into it would reach freed regions.
+    VELMUNDO_DestroyStack(doc);
+    doc->state->focusedRegion = doc->state->focusedTopParent = doc->state->currentRegion = VELMREGIONCOPY{};
     AUDIOSIGNAL_Destroy(old);
     VELMSTATE_ResetChanges(doc);
     reset_view(doc);

@@ -2,6 +2,8 @@
 // unload, references, the close query and the events each step sends.
 #include "core/velmaudio.h"
 #include "core/velmnavigation.h"
+#include "edit/velmregion.h"
+#include "edit/velmundo.h"
 #include "testaudio.hpp"
 
 #include <gtest/gtest.h>
@@ -172,6 +174,33 @@ TEST(DocumentOpen, OpenSaveRevertSendTheirEvents)
     ASSERT_TRUE(VELMAUDIO_SaveAs(doc, dir.file("copy.wav").c_str(), "WAVE"));
     EXPECT_EQ(events.log.global_only(), (std::vector<uint32_t>{0x20006}));
     EXPECT_STREQ(VELMAUDIO_GetFileName(doc), dir.file("copy.wav").c_str());
+    EXPECT_TRUE(VELMAUDIO_Close(doc));
+}
+
+// The undo history holds region records and block lists of the signal it
+// was written against; after a revert to the saved file it must not reach
+// into the signal that was dropped, nor keep a focus on its regions.
+TEST(DocumentOpen, RevertLeavesNoStepsIntoTheDroppedSignal)
+{
+    velmtest::TempDir dir;
+    const std::string path = dir.file("tone.wav");
+    ASSERT_TRUE(velmtest::write_audio(path, velmtest::sine(8000, 1, 8000), 8000, 1));
+    VELMAUDIO doc = VELMAUDIO_Open(path.c_str(), "AUTO");
+    ASSERT_NE(doc, nullptr);
+    AUDIOREGION *region = VELMAUDIO_CreateRegionEx(doc, "default", 1000, 2000, "word", nullptr, 0);
+    ASSERT_NE(region, nullptr);
+    ASSERT_TRUE(VELMAUDIO_SetFocusOnRegion(doc, region));
+    ASSERT_TRUE(VELMAUDIO_SetRegionLabel(doc, region, "other"));
+    modify(doc);
+    ASSERT_GT(VELMUNDO_Count(doc), 0);
+
+    ASSERT_TRUE(VELMAUDIO_RevertToSaved(doc));
+    EXPECT_EQ(VELMUNDO_Count(doc), 0);
+    EXPECT_EQ(VELMAUDIO_Undo(doc), 0);
+    EXPECT_EQ(VELMAUDIO_GetRegionOnFocus(doc), nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_NumSamples(VELMAUDIO_GetAudioSignal(doc)), 8000);
+    EventLog accept;
+    VELMAUDIO_AddEventHandler(doc, EventLog::handler, &accept);
     EXPECT_TRUE(VELMAUDIO_Close(doc));
 }
 
