@@ -171,9 +171,20 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
         break;
     case 0x80: case 0x100: case 0x180: {
         // -1: the region also shows over the lanes, which only a full redraw repaints.
+        // Otherwise the region layers copy columns of the tracks out of the
+        // memory target and mark just those dirty: the selections over them
+        // are drawn there again.
+        const _VELMRECT before = d->dirty;
+        reset_dirty(d);
         const int redrawn = call_hook(hooks.changedRegion, d);
+        const _VELMRECT copied = d->dirty;
+        d->dirty = before;
+        if (copied.right >= copied.left) mark_dirty(d, copied.left, copied.top, copied.right, copied.bottom);
         if (redrawn >= 0) {
             ok &= redrawn;
+            if (copied.right >= copied.left)
+                ok &= draw_track_selections(d, d->state, copied.left - d->display.left,
+                                            copied.right - d->display.left);
             break;
         }
         ok &= full_redraw(d, kEverything);

@@ -11,7 +11,9 @@
 #include "core/document_internal.hpp"
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
+#include "core/velmtimeconv.h"
 #include "edit/velmcustomtrack.h"
+#include "edit/velmregion.h"
 #include "edit/velmselection.h"
 #include "render/view/drawer_internal.hpp"
 #include "render/view/velmoverlays.h"
@@ -568,6 +570,37 @@ TEST_F(Overlays, CursorsAndSelectionsCrossCustomTracksWithoutTrails)
     ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, sample_at(200), sample_at(260)));
     ASSERT_TRUE(canvas.draw(doc));
     EXPECT_GT(brightness(canvas.output().pixel(x_of(230), y)), brightness(bare.pixel(x_of(230), y)));
+}
+
+// A region edge moved under a selection: the columns the track redraws keep
+// the selection over them, as a full draw shows it.
+TEST_F(Overlays, SelectionStaysOverATrackWhoseRegionChanged)
+{
+    VELMAUDIO moved = open(kWave), direct = open(kWave);
+    viewtest::Canvas a(kWidth, 300), b(kWidth, 300);
+    AUDIOREGION *region = nullptr;
+    for (VELMAUDIO doc : {moved, direct}) {
+        ASSERT_TRUE(VELMAUDIO_AddCustomTrack(doc, "words"));
+        ASSERT_TRUE(VELMAUDIO_ShowCustomTrack(doc, "words"));
+        ASSERT_TRUE(VELMAUDIO_HideMainCursor(doc));
+        region = VELMAUDIO_CreateRegionEx(doc, "words", sample_at(100), sample_at(200), "word", nullptr, 0);
+        ASSERT_NE(region, nullptr);
+        ASSERT_TRUE(VELMAUDIO_SetFocusOnRegion(doc, region));
+    }
+    zoom_to_grid(a, moved);
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(moved, sample_at(150), sample_at(300)));
+    ASSERT_TRUE(a.draw(moved));
+    AUDIOREGION *focused = VELMAUDIO_GetRegionOnFocus(moved);
+    ASSERT_NE(focused, nullptr);
+    ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(moved, focused, VELMAUDIO_SampleToTime(moved, sample_at(250)), 0));
+    ASSERT_TRUE(a.draw(moved));
+
+    ASSERT_TRUE(b.draw(direct));
+    ASSERT_TRUE(VELMAUDIO_Zoom(direct, 0, int64_t{display.width - 1} * kStep));
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(direct, sample_at(150), sample_at(300)));
+    ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(direct, region, VELMAUDIO_SampleToTime(direct, sample_at(250)), 0));
+    ASSERT_TRUE(b.draw(direct));
+    EXPECT_EQ(viewtest::count_differences(a.output(), b.output()), 0);
 }
 
 TEST_F(Overlays, RefusesMissingHandlesAndRenderers)
