@@ -7,6 +7,7 @@
 #include "core/state_internal.hpp"
 #include "core/velmqueries.h"
 #include "core/velmnavigation.h"
+#include "control/velmcontrol.h"
 #include "render/view/drawer_internal.hpp"
 #include "render/view/overlay_internal.hpp"
 #include "render/view/velmoverlays.h"
@@ -146,6 +147,21 @@ int draw_selection_overlays(VELMDRAW d)
     return VELMDRAW_DrawNavigatorState(d) && ok;
 }
 
+// The output from memory, the held region's tint and the selections over it.
+int redraw_focus_layers(VELMDRAW d)
+{
+    int ok = VELMDRAW_FullRedrawFromMemory(d);
+    ok &= call_hook(draw_hooks().regionOnFocus, d, 0, d->columns - 1);
+    return draw_selection_overlays(d) && ok;
+}
+
+// Whether the tint of a held region shows over the lanes.  It saves what it
+// covers, so the restore at the start of every frame takes it away.
+bool region_held(VELMDRAW d)
+{
+    return d->state->focusedRegion.region && VELMCONTROL_IsGrabbingRegion(d);
+}
+
 // The partial or full redraw that the change mask asks for; `drawn` is the
 // state the pixels showed before.
 int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
@@ -154,7 +170,12 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
     VELMCANVAS canvas = d->canvas;
     const int last = d->columns - 1;
     int ok = 1;
-    switch (mask & ~0x1000u) {
+    uint32_t work = mask & ~0x1000u;
+    // While a region is held its tint is drawn again in every frame, under
+    // the selections as a full redraw puts it.
+    const bool held = region_held(d);
+    if (held && (work == 0 || work == 0x2 || work == 0x4 || work == 0x6 || work == 0x42)) work = 0x40;
+    switch (work) {
     case 0: break;
     case 0x2:
         ok &= update_selecting(d, drawn, d->state);
@@ -164,16 +185,25 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
         ok &= VELMDRAW_FullRedrawFromMemory(d);
         ok &= draw_selection_overlays(d);
         break;
-    case 0x40:
-        ok &= VELMDRAW_FullRedrawFromMemory(d);
-        ok &= call_hook(hooks.regionOnFocus, d, 0, last);
-        ok &= draw_selection_overlays(d);
-        break;
+    case 0x40: ok &= redraw_focus_layers(d); break;
     case 0x80: case 0x100: case 0x180: {
         // -1: the region also shows over the lanes, which only a full redraw repaints.
+        // Otherwise the region layers copy columns of the tracks out of the
+        // memory target and mark just those dirty: the selections over them
+        // are drawn there again.
+        const _VELMRECT before = d->dirty;
+        reset_dirty(d);
         const int redrawn = call_hook(hooks.changedRegion, d);
+        const _VELMRECT copied = d->dirty;
+        d->dirty = before;
+        if (copied.right >= copied.left) mark_dirty(d, copied.left, copied.top, copied.right, copied.bottom);
         if (redrawn >= 0) {
             ok &= redrawn;
+            if (held)
+                ok &= redraw_focus_layers(d);
+            else if (copied.right >= copied.left)
+                ok &= draw_track_selections(d, d->state, copied.left - d->display.left,
+                                            copied.right - d->display.left);
             break;
         }
         ok &= full_redraw(d, kEverything);

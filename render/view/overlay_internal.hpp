@@ -47,6 +47,9 @@ bool is_empty(const _VELMRECT &r);
 
 // Overlay steps of a frame.
 int draw_selection_list(VELMDRAW d, const VELMSTATE *state, int first, int last);
+// The same over the custom tracks only, after the region layers copied
+// columns of the tracks from the memory target.
+int draw_track_selections(VELMDRAW d, const VELMSTATE *state, int first, int last);
 int update_selecting(VELMDRAW d, const VELMSTATE *drawn, const VELMSTATE *state);
 int draw_selecting_label(VELMDRAW d, const VELMSTATE *state);
 int draw_zoom_limit_bar(VELMDRAW d, int which);

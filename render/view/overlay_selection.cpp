@@ -75,13 +75,14 @@ bool any_inactive_lane(VELMDRAW d)
     return false;
 }
 
-int draw_list(VELMDRAW d, const VELMSELECTION *list, int first, int last, int mode, bool soft_edges)
+int draw_list(VELMDRAW d, const VELMSELECTION *list, int first, int last, int mode, bool soft_edges,
+              bool tracks_only = false)
 {
     if (selections_hidden(d) || !list) return 1;
     first = std::max(first, 0);
     last = std::min(last, d->columns - 1);
     if (last < first) return 1;
-    for (int i = 0; i < d->laneCount; ++i) {
+    for (int i = 0; i < d->laneCount && !tracks_only; ++i) {
         const Lane &lane = d->lanes[static_cast<size_t>(i)];
         if (active_main_lane(lane)) draw_over_area(d, &d->mainBase, lane.area, list, first, last, mode, soft_edges);
     }
@@ -101,11 +102,11 @@ VELMSELECTION selecting_of(const VELMSTATE *state)
     return one;
 }
 
-int draw_selecting(VELMDRAW d, const VELMSTATE *state, int first, int last)
+int draw_selecting(VELMDRAW d, const VELMSTATE *state, int first, int last, bool tracks_only = false)
 {
     const VELMSELECTION one = selecting_of(state);
     if (empty_selection(one) || last < first) return 1;
-    return draw_list(d, &one, first, last, state->selectingKind, false);
+    return draw_list(d, &one, first, last, state->selectingKind, false, tracks_only);
 }
 
 // Columns first .. last lose the selection being made: back to the slow
@@ -123,6 +124,13 @@ int draw_selection_list(VELMDRAW d, const VELMSTATE *state, int first, int last)
 {
     int ok = draw_list(d, state->selections, first, last, 0, true);
     ok &= draw_selecting(d, state, first, last);
+    return ok;
+}
+
+int draw_track_selections(VELMDRAW d, const VELMSTATE *state, int first, int last)
+{
+    int ok = draw_list(d, state->selections, first, last, 0, true, true);
+    ok &= draw_selecting(d, state, first, last, true);
     return ok;
 }
 

@@ -11,7 +11,9 @@
 #include "core/document_internal.hpp"
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
+#include "core/velmtimeconv.h"
 #include "edit/velmcustomtrack.h"
+#include "edit/velmregion.h"
 #include "edit/velmselection.h"
 #include "render/view/drawer_internal.hpp"
 #include "render/view/velmoverlays.h"
@@ -568,6 +570,72 @@ TEST_F(Overlays, CursorsAndSelectionsCrossCustomTracksWithoutTrails)
     ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, sample_at(200), sample_at(260)));
     ASSERT_TRUE(canvas.draw(doc));
     EXPECT_GT(brightness(canvas.output().pixel(x_of(230), y)), brightness(bare.pixel(x_of(230), y)));
+}
+
+// A region edge moved under a selection: the columns the track redraws keep
+// the selection over them, as a full draw shows it.
+TEST_F(Overlays, SelectionStaysOverATrackWhoseRegionChanged)
+{
+    VELMAUDIO moved = open(kWave), direct = open(kWave);
+    viewtest::Canvas a(kWidth, 300), b(kWidth, 300);
+    AUDIOREGION *region = nullptr;
+    for (VELMAUDIO doc : {moved, direct}) {
+        ASSERT_TRUE(VELMAUDIO_AddCustomTrack(doc, "words"));
+        ASSERT_TRUE(VELMAUDIO_ShowCustomTrack(doc, "words"));
+        ASSERT_TRUE(VELMAUDIO_HideMainCursor(doc));
+        region = VELMAUDIO_CreateRegionEx(doc, "words", sample_at(100), sample_at(200), "word", nullptr, 0);
+        ASSERT_NE(region, nullptr);
+        ASSERT_TRUE(VELMAUDIO_SetFocusOnRegion(doc, region));
+    }
+    zoom_to_grid(a, moved);
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(moved, sample_at(150), sample_at(300)));
+    ASSERT_TRUE(a.draw(moved));
+    AUDIOREGION *focused = VELMAUDIO_GetRegionOnFocus(moved);
+    ASSERT_NE(focused, nullptr);
+    ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(moved, focused, VELMAUDIO_SampleToTime(moved, sample_at(250)), 0));
+    ASSERT_TRUE(a.draw(moved));
+
+    ASSERT_TRUE(b.draw(direct));
+    ASSERT_TRUE(VELMAUDIO_Zoom(direct, 0, int64_t{display.width - 1} * kStep));
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(direct, sample_at(150), sample_at(300)));
+    ASSERT_TRUE(VELMAUDIO_ChangeRegionEnd(direct, region, VELMAUDIO_SampleToTime(direct, sample_at(250)), 0));
+    ASSERT_TRUE(b.draw(direct));
+    EXPECT_EQ(viewtest::count_differences(a.output(), b.output()), 0);
+}
+
+// A held region moved along its track: its tint over the lanes moves with
+// it, as a full draw of the same state shows it.
+TEST_F(Overlays, HeldRegionTintFollowsTheMovedRegion)
+{
+    VELMAUDIO moved = open(kWave), direct = open(kWave);
+    viewtest::Canvas a(kWidth, 300), b(kWidth, 300);
+    const auto prepare = [&](VELMAUDIO doc, viewtest::Canvas &canvas) {
+        ASSERT_TRUE(VELMAUDIO_AddCustomTrack(doc, "words"));
+        ASSERT_TRUE(VELMAUDIO_ShowCustomTrack(doc, "words"));
+        ASSERT_TRUE(VELMAUDIO_HideMainCursor(doc));
+        AUDIOREGION *region = VELMAUDIO_CreateRegionEx(doc, "words", sample_at(100), sample_at(200), "word", nullptr, 0);
+        ASSERT_NE(region, nullptr);
+        ASSERT_TRUE(VELMAUDIO_SetFocusOnRegion(doc, region));
+        zoom_to_grid(canvas, doc);
+        velm::control::Interaction &control = doc->renderer->control;
+        control.buttonReleased = 0;
+        control.dragState = velm::control::kMovingRegions;
+        ASSERT_TRUE(VELMAUDIO_EventOverFocusedRegion(doc));
+    };
+    prepare(moved, a);
+    ASSERT_TRUE(a.draw(moved));
+    prepare(direct, b);
+    for (VELMAUDIO doc : {moved, direct}) ASSERT_TRUE(VELMAUDIO_OffsetRegions(doc, 60 * kStep));
+    ASSERT_TRUE(a.draw(moved));
+    ASSERT_TRUE(b.draw(direct));
+    EXPECT_EQ(viewtest::count_differences(a.output(), b.output()), 0);
+    // Still held, a frame that only moves the play cursor keeps the tint.
+    set_play_cursor(moved, sample_at(400));
+    ASSERT_TRUE(a.draw(moved));
+    const QImage held = a.output();
+    ASSERT_TRUE(VELMSTATE_NotifyChanges(moved, 0x80000000u));
+    ASSERT_TRUE(a.draw(moved));
+    EXPECT_EQ(viewtest::count_differences(held, a.output()), 0);
 }
 
 TEST_F(Overlays, RefusesMissingHandlesAndRenderers)
