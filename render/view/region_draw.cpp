@@ -4,11 +4,9 @@
 #include <algorithm>
 #include <vector>
 
-#include "control/velmcontrol.h"
 #include "core/document_internal.hpp"
 #include "core/velmaudio.h"
 #include "edit/velmcustomtrack.h"
-#include "render/view/overlay_internal.hpp"
 #include "render/view/region_internal.hpp"
 #include "render/view/velmoverlays.h"
 
@@ -178,49 +176,23 @@ int VELMDRAW_UpdateChangedRegion(VELMDRAW d, const VELMREGIONCOPY *changed)
     const RegionChange change = changed_regions(d, now);
     if (change.lanes) return -1;
     const _VELMRECT band = track_band(d);
-    int first = std::max(change.left - 1 - d->display.left, 0);
-    int last = std::min(change.right + 1 - d->display.left, d->columns - 1);
-    const bool tracks = change.any() && band.height > 0 && first <= last;
+    const int first = std::max(change.left - 1 - d->display.left, 0);
+    const int last = std::min(change.right + 1 - d->display.left, d->columns - 1);
+    if (!change.any() || band.height <= 0 || last < first) return keep_entries(d, now) ? 1 : 0;
 
     VELMCANVAS c = d->canvas;
-    int ok = 1;
-    if (tracks) {
-        VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_MEMORY);
-        // The backgrounds span the lanes too: keep them to the tracks.
-        const _VELMRECT clip = make_rect(d->display.left + first, band.top, last - first + 1, band.height);
-        VELMCANVAS_SetDrawArea(c, &clip);
-        ok &= VELMDRAW_DrawCanvas(d, first, last);
-        if (const auto grids = draw_hooks().scaleGrids) ok &= grids(d, first, last);
-        VELMCANVAS_ClearDrawArea(c);
-        ok &= keep_entries(d, now) ? 1 : 0;
-        ok &= VELMDRAW_DrawCustomTrackRegions(d, first, last);
-    } else {
-        ok &= keep_entries(d, now) ? 1 : 0;
-        first = d->columns;
-        last = -1;
-    }
-
-    // The output holds what is drawn over the slow picture: the held
-    // region's tint (erased with the overlays at the start of the frame)
-    // and the selections, over the lanes and the tracks.  Those columns are
-    // copied from memory and drawn over again.
-    RegionEntry held;
-    if (VELMCONTROL_IsGrabbingRegion(d) && d->state->focusedRegion.region &&
-        area_from_region(d, static_cast<const AUDIOREGION *>(d->state->focusedRegion.region),
-                         VELMAUDIO_FindCustomTrackId(d->document, "default"), &held)) {
-        first = std::max(std::min(first, held.area.left - 1 - d->display.left), 0);
-        last = std::min(std::max(last, held.area.right + 1 - d->display.left), d->columns - 1);
-    }
-    if (last < first) return ok;
-    // The tint's edge lines reach one row above the lanes.
-    const int32_t top = d->lanesArea.top - 1;
-    const int32_t bottom = std::max(band.height > 0 ? band.bottom : top, d->lanesArea.bottom + 1);
-    const _VELMRECT columns = make_rect(d->display.left + first, top, last - first + 1, bottom - top + 1);
-    ok &= VELMCANVAS_MoveBlock2(c, VELMCANVASTARGET_MEMORY, columns.left, columns.top, columns.width, columns.height,
-                                VELMCANVASTARGET_OUTPUT, columns.left, columns.top);
+    VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_MEMORY);
+    // The backgrounds span the lanes too: keep them to the tracks.
+    const _VELMRECT clip = make_rect(d->display.left + first, band.top, last - first + 1, band.height);
+    VELMCANVAS_SetDrawArea(c, &clip);
+    int ok = VELMDRAW_DrawCanvas(d, first, last);
+    if (const auto grids = draw_hooks().scaleGrids) ok &= grids(d, first, last);
+    VELMCANVAS_ClearDrawArea(c);
+    ok &= keep_entries(d, now) ? 1 : 0;
+    ok &= VELMDRAW_DrawCustomTrackRegions(d, first, last);
+    ok &= VELMCANVAS_MoveBlock2(c, VELMCANVASTARGET_MEMORY, clip.left, clip.top, clip.width, clip.height,
+                                VELMCANVASTARGET_OUTPUT, clip.left, clip.top);
     VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_OUTPUT);
-    mark_dirty(d, columns.left, columns.top, columns.right, columns.bottom);
-    ok &= VELMDRAW_DrawRegionOnFocus(d, first, last);
-    ok &= draw_selection_list(d, d->state, first, last);
+    mark_dirty(d, clip.left, clip.top, clip.right, clip.bottom);
     return ok;
 }
