@@ -49,7 +49,10 @@ int VELMDRAW_DrawBackground(VELMDRAW d)
 {
     if (!d || !d->canvas || !d->state) return 0;
     const uint32_t f = d->state->viewFlags;
-    if (on(f, 0x1000000)) return 1;
+    if (on(f, 0x1000000)) {
+        clear_rect(d->canvas, make_rect(0, 0, d->state->drawWidth, d->state->drawHeight));
+        return 1;
+    }
     const VELMDRAWCONFIG &c = d->config;
     VELMCANVAS_SelectColor(d->canvas, VELMDRAW_SelectBGColor(d));
     VELMCANVAS_FillRect(d->canvas, 0, 0, d->state->drawWidth, d->state->drawHeight, 0);

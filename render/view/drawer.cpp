@@ -24,6 +24,14 @@ _VELMRECT make_rect(int32_t left, int32_t top, int32_t width, int32_t height)
     return _VELMRECT{left, top, width, height, left + width - 1, top + height - 1};
 }
 
+void clear_rect(VELMCANVAS canvas, const _VELMRECT &rect)
+{
+    if (rect.width <= 0 || rect.height <= 0) return;
+    VELMCANVAS_SetDrawArea(canvas, &rect);
+    VELMCANVAS_Clear(canvas);
+    VELMCANVAS_ClearDrawArea(canvas);
+}
+
 void draw_hline(VELMCANVAS canvas, int x1, int x2, int y)
 {
     if (x2 >= x1) VELMCANVAS_FillRect(canvas, x1, y, x2 - x1 + 1, 1, 0);

@@ -176,6 +176,9 @@ void mark_dirty(VELMDRAW drawer, int32_t left, int32_t top, int32_t right, int32
 
 // Small rectangle helpers.
 _VELMRECT make_rect(int32_t left, int32_t top, int32_t width, int32_t height);
+// Makes a rectangle of the current target fully transparent (the
+// background of a transparent view).
+void clear_rect(VELMCANVAS canvas, const _VELMRECT &rect);
 // Axis-aligned lines of the selected colour covering both end points.
 void draw_hline(VELMCANVAS canvas, int x1, int x2, int y);
 void draw_vline(VELMCANVAS canvas, int x, int y1, int y2);

@@ -420,7 +420,7 @@ int VELMDRAW_UpdateDraw(VELMDRAW d, VELMCANVAS canvas, const VELMSTATE *state, _
 
     if (changed) {
         const _VELMRECT &r = d->dirty;
-        *changed = r.right >= r.left && r.bottom >= r.top && (r.right || r.bottom)
+        *changed = r.right >= r.left && r.bottom >= r.top
                        ? make_rect(r.left, r.top, r.right - r.left + 1, r.bottom - r.top + 1)
                        : _VELMRECT{};
     }

@@ -182,10 +182,11 @@ int VELMDRAW_UpdateChangedRegion(VELMDRAW d, const VELMREGIONCOPY *changed)
 
     VELMCANVAS c = d->canvas;
     VELMCANVAS_SelectTarget(c, VELMCANVASTARGET_MEMORY);
-    // The backgrounds span the lanes too: keep them to the tracks.
+    // Only the tracks' backgrounds lie in the band; the grids span the lanes
+    // too, so the band is the clip.
     const _VELMRECT clip = make_rect(d->display.left + first, band.top, last - first + 1, band.height);
     VELMCANVAS_SetDrawArea(c, &clip);
-    int ok = VELMDRAW_DrawCanvas(d, first, last);
+    int ok = VELMDRAW_DrawCustomCanvas(d, first, last);
     if (const auto grids = draw_hooks().scaleGrids) ok &= grids(d, first, last);
     VELMCANVAS_ClearDrawArea(c);
     ok &= keep_entries(d, now) ? 1 : 0;

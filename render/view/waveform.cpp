@@ -220,11 +220,14 @@ int draw_wave(VELMDRAW d, Lane *lane, int first, int last)
 
 int draw_wave_background(VELMDRAW d, Lane *lane, int first, int last)
 {
-    if (d->state->viewFlags & 0x1000000u) return 1;
     const _VELMRECT &a = lane->area;
     first = std::max(first, 0);
     last = std::min(last, a.width - 1);
     if (last < first || a.height <= 0) return 1;
+    if (d->state->viewFlags & 0x1000000u) {
+        clear_rect(d->canvas, make_rect(a.left + first, a.top, last - first + 1, a.height));
+        return 1;
+    }
     const VELMDRAWCONFIG &c = d->config;
     const int32_t split = std::clamp(lane->zeroRow, 0, a.height);
     const int32_t x = a.left + first, width = last - first + 1;

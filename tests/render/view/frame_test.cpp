@@ -97,6 +97,14 @@ TEST_F(Frame, ScrollingSpectrogramsAndNavigatorEqualsAFullRedraw)
     expect_scroll_matches_full_draw(path, 0x2 | 0xC, 12000, 11000, 6000);
 }
 
+// A transparent view paints no backgrounds: the columns a scroll uncovers
+// must be cleared, not keep the pixels that moved away.
+TEST_F(Frame, ScrollingATransparentViewEqualsAFullRedraw)
+{
+    expect_scroll_matches_full_draw(path, 0x1 | 0xC | 0x1000000, 4000, 4900, 8000);
+    expect_scroll_matches_full_draw(path, 0x1 | 0xC | 0x1000000, 9000, 7777, 8000);
+}
+
 TEST_F(Frame, ScrollingAtSampleLevelEqualsAFullRedraw)
 {
     expect_scroll_matches_full_draw(path, 0x1 | 0xC, 3000, 3003, 60);
