@@ -17,14 +17,14 @@ std::vector<VELMDRAW> &live_drawers()
     return drawers;
 }
 
+// Canvases are drawn on and destroyed on the shell's interface thread, and
+// the drawers' workers never touch the canvas: no drawer lock is taken here,
+// which also keeps this lock from ever being taken inside a drawer's.
 void forget_canvas(VELMCANVAS canvas)
 {
     std::lock_guard guard(registry_lock);
-    for (VELMDRAW drawer : live_drawers()) {
-        MutexLock(drawer->lock);
+    for (VELMDRAW drawer : live_drawers())
         if (drawer->canvas == canvas) drawer->canvas = nullptr;
-        MutexUnlock(drawer->lock);
-    }
 }
 
 } // namespace

@@ -24,11 +24,17 @@ CursorStyle style_of(VELMDRAW d, const VELMCURSOR &cursor)
             c.mainCursorDrawSlider != 0};
 }
 
+// Whether a cursor is drawn at all; the main lanes also need it in the view
+// window, the navigator shows the whole sound.
+bool cursor_enabled(VELMDRAW d, const VELMCURSOR &cursor)
+{
+    return !(d->state->viewFlags & 0x400000u) && (cursor.shown || cursor.flag);
+}
+
 bool cursor_wanted(VELMDRAW d, const VELMCURSOR &cursor)
 {
     const VELMSTATE *s = d->state;
-    return !(s->viewFlags & 0x400000u) && (cursor.shown || cursor.flag) && cursor.position >= s->viewBegin &&
-           cursor.position <= s->viewEnd;
+    return cursor_enabled(d, cursor) && cursor.position >= s->viewBegin && cursor.position <= s->viewEnd;
 }
 
 // The shadow reaches this far on each side of a cursor line.
@@ -89,7 +95,7 @@ int draw_cursor(VELMDRAW d, const VELMCURSOR &cursor)
 
 int draw_navigator_cursor(VELMDRAW d, const VELMCURSOR &cursor)
 {
-    if (!d->navigatorPosition || !cursor_wanted(d, cursor)) return 1;
+    if (!d->navigatorPosition || !cursor_enabled(d, cursor)) return 1;
     const int column = column_of(&d->navigatorBase, static_cast<double>(cursor.position));
     if (column < 0 || column >= d->columns) return 1;
     const CursorStyle style = style_of(d, cursor);

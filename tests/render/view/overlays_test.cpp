@@ -330,6 +330,32 @@ TEST_F(Overlays, NavigatorShowsTheVisibleWindow)
     EXPECT_EQ(zoomed.pixel(inside, y), whole.pixel(inside, y));
 }
 
+// The navigator shows the whole sound, so it shows the cursor wherever it is,
+// also outside the visible window.
+TEST_F(Overlays, NavigatorShowsTheCursorOutsideTheWindow)
+{
+    VELMAUDIO doc = open(kWave | 0x4000);
+    viewtest::Canvas canvas(kWidth, 300);
+    ASSERT_TRUE(canvas.draw(doc));
+    const int64_t length = VELMAUDIO_ViewEnd(doc);
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, length / 4, length / 2));
+    ASSERT_TRUE(VELMAUDIO_HideMainCursor(doc));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QImage hidden = canvas.output();
+    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, length * 3 / 4));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QImage shown = canvas.output();
+
+    _VELMRECT navigator{};
+    ASSERT_TRUE(VELMAUDIO_GetDrawAreaRect(doc, VELMDRAW_AREA_NAVIGATOR, &navigator));
+    const std::vector<int> columns = differing_columns(hidden, shown);
+    ASSERT_FALSE(columns.empty());
+    const int x = navigator.left + navigator.width * 3 / 4;
+    EXPECT_LE(columns.front(), x);
+    EXPECT_GE(columns.back(), x);
+    EXPECT_NE(hidden.pixel(x, navigator.top + navigator.height / 2), shown.pixel(x, navigator.top + navigator.height / 2));
+}
+
 TEST_F(Overlays, ZoomLimitBars)
 {
     VELMAUDIO doc = open(kWave);
