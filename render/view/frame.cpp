@@ -139,11 +139,14 @@ int full_redraw(VELMDRAW d, uint32_t mask)
     return ok;
 }
 
-// Output target after a restore from memory: the selections and the
-// navigator's state over the slow picture.
+// Output target after a restore from memory: the selections, the quick box
+// while one is being dragged (it is not an overlay: only a restore erases
+// it) and the navigator's state over the slow picture.
 int draw_selection_overlays(VELMDRAW d)
 {
     int ok = draw_selection_list(d, d->state, 0, d->columns - 1);
+    const VELMQUICKBOX &box = d->state->quickBox;
+    if (box.width != 0 && box.height != 0) ok &= VELMDRAW_ShowQuickBox(d, &box);
     return VELMDRAW_DrawNavigatorState(d) && ok;
 }
 
@@ -212,9 +215,7 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
     }
     case 0x200:
         ok &= VELMDRAW_FullRedrawFromMemory(d);
-        ok &= draw_selection_list(d, d->state, 0, last);
-        ok &= VELMDRAW_ShowQuickBox(d, &d->state->quickBox);
-        ok &= VELMDRAW_DrawNavigatorState(d);
+        ok &= draw_selection_overlays(d);
         break;
     case 0x4000: ok &= call_hook(hooks.vertScales, d); break;
     case 0x811: case 0x813:

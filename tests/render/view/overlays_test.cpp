@@ -425,6 +425,12 @@ TEST_F(Overlays, QuickBoxIsOrderedAndCutToItsLane)
     EXPECT_GT(lift(lane.left + 150, lane.top + 20), lift(lane.left + 150, lane.top + 19));
     EXPECT_GT(lift(lane.left + 150, lane.top + 19), 0);
     EXPECT_EQ(image.pixel(lane.left + 150, lane.top + 40), bare.pixel(lane.left + 150, lane.top + 40));
+
+    // A whole redraw in the middle of the drag (a new canvas) keeps the box.
+    viewtest::Canvas other(kWidth, 300);
+    VELMSTATE_NotifyChanges(doc, 0); // a fresh canvas is drawn only with a change pending
+    ASSERT_TRUE(other.draw(doc));
+    EXPECT_EQ(viewtest::count_differences(other.output(), image), 0);
 }
 
 TEST_F(Overlays, SelectionHandlesAreRecordedInDrawingOrder)
