@@ -71,7 +71,8 @@ typedef int (*AUDIOSIGNAL_CALLBACK)(void *parent, int code, void *data1, void *d
  * positive rate). */
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_New(const AUDIO_FORMAT *format);
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_NewEx(const AUDIO_FORMAT *format);
-/* A signal of frames silent frames; silence takes no sample memory. */
+/* A signal of frames silent frames (at most 2^36); silence takes no sample
+ * memory. */
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_CreateSilence(const AUDIO_FORMAT *format, int64_t frames);
 /* A copy sharing every block; format, masks, metadata, regions, stamps and
  * hash are copied, the parent object is not.  flags are reserved (pass 0). */
@@ -305,7 +306,8 @@ AUDIO_API int AUDIOSIGNAL_ApplyEffectEx(AUDIOSIGNAL *signal, int flags, int64_t 
  * change rate, channels and bits ("fmtconv[sr=48000,nc=1]"); metadata and
  * regions come along.  Null for a bad script. */
 AUDIO_API AUDIOSIGNAL *AUDIOSIGNAL_ApplyTransform(AUDIOSIGNAL *signal, const char *effect);
-/* Returns the frames appended (frames, or -1 on failure). */
+/* Returns the frames appended (frames, or -1 on failure, also when the
+ * signal would grow beyond 2^36 frames). */
 AUDIO_API int64_t AUDIOSIGNAL_AppendSilence(AUDIOSIGNAL *signal, int64_t frames);
 /* Swaps the two channels of a stereo signal. */
 AUDIO_API int AUDIOSIGNAL_SwapChannels(AUDIOSIGNAL *signal);

@@ -295,6 +295,12 @@ int64_t AUDIOSIGNAL_AppendSilence(AUDIOSIGNAL *signal, int64_t frames)
         return -1;
     }
     Edit edit(*signal);
+    // Silence costs one slice per chunk of frames: an absurd length would
+    // take unbounded memory (and overflow the positions).
+    if (frames > kMaxSilenceFrames - edit.length()) {
+        bad_argument();
+        return -1;
+    }
     for (int c = 0; c < edit.channels(); ++c) {
         const Segments &source = edit.current(c);
         edit.set(c, splice(source, source.length(), source.length(), [&](SegmentsBuilder &b) {

@@ -73,6 +73,9 @@ struct _audio_signal final : velmsig::RegionHost {
 
 namespace velmsig {
 
+// The longest signal that silence may grow (about 18 days at 44.1 kHz).
+constexpr int64_t kMaxSilenceFrames = int64_t(1) << 36;
+
 // A process-wide, ever-growing stamp: every change gets a value never used before.
 uint64_t next_stamp();
 

@@ -60,6 +60,23 @@ TEST(SignalStoreSignal, SilenceTakesNoSampleMemory)
     AUDIOSIGNAL_Destroy(signal);
 }
 
+TEST(SignalStoreSignal, AbsurdSilenceLengthsFailAndChangeNothing)
+{
+    AUDIO_FORMAT format = format_of(1);
+    EXPECT_EQ(AUDIOSIGNAL_CreateSilence(&format, AUDIOSIGNAL_END), nullptr);
+    AUDIOSIGNAL *signal = make_signal(random_channels(1, 1000, 5));
+    const uint64_t stamp = AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_CHANGES);
+    // Both the overflowing and the merely enormous length are refused.
+    EXPECT_EQ(AUDIOSIGNAL_AppendSilence(signal, AUDIOSIGNAL_END - 500), -1);
+    EXPECT_EQ(AUDIOSIGNAL_AppendSilence(signal, int64_t(1) << 50), -1);
+    EXPECT_EQ(AUDIOSIGNAL_NumSamples(signal), 1000);
+    EXPECT_EQ(AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_CHANGES), stamp);
+    // A day of silence at 96 kHz is not absurd.
+    EXPECT_EQ(AUDIOSIGNAL_AppendSilence(signal, int64_t(96000) * 86400), int64_t(96000) * 86400);
+    EXPECT_EQ(AUDIOSIGNAL_NumSamples(signal), 1000 + int64_t(96000) * 86400);
+    AUDIOSIGNAL_Destroy(signal);
+}
+
 TEST(SignalStoreSignal, ChangeStampsMoveWithEveryChange)
 {
     AUDIOSIGNAL *signal = make_signal(random_channels(1, 5000, 1));
