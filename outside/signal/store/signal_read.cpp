@@ -95,7 +95,7 @@ int64_t AUDIOSIGNAL_GetMaskedSamplesWithStep(AUDIOSIGNAL *signal, uint32_t mask,
     const int64_t frames = std::min(count, reach);
     const int width = __builtin_popcount(mask);
     // Pieces of at most one chunk of frames keep the buffer small.
-    const int64_t piece = std::max<int64_t>(1, kChunkFrames / std::abs(step));
+    const int64_t piece = std::max<int64_t>(1, kChunkFrames / std::abs(int64_t(step)));
     thread_local std::vector<float> buffer;
     for (int64_t done = 0; done < frames; done += piece) {
         const int64_t n = std::min(piece, frames - done);

@@ -45,6 +45,18 @@ TEST(SignalStoreRead, MaskedSamplesInterleaveTheChosenChannels)
     AUDIOSIGNAL_Destroy(signal);
 }
 
+TEST(SignalStoreRead, ExtremeStepsReadOneFrame)
+{
+    const Channels samples = random_channels(1, 5000, 3);
+    AUDIOSIGNAL *signal = make_signal(samples);
+    float out[2] = {0.0f, 0.0f};
+    EXPECT_EQ(AUDIOSIGNAL_GetMaskedSamplesWithStep(signal, 0x1, 4999, out, 2, INT32_MIN), 1);
+    EXPECT_EQ(out[0], samples[0][4999]);
+    EXPECT_EQ(AUDIOSIGNAL_GetMaskedSamplesWithStep(signal, 0x1, 7, out, 2, INT32_MAX), 1);
+    EXPECT_EQ(out[0], samples[0][7]);
+    AUDIOSIGNAL_Destroy(signal);
+}
+
 TEST(SignalStoreRead, LongMaskedReadsInPieces)
 {
     const Channels samples = random_channels(2, 300000, 6);
