@@ -205,6 +205,8 @@ int AUDIOSIGNAL_ClearEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t e
 {
     if (!signal) return bad_argument();
     Edit edit(*signal);
+    // Without a channel nothing is removed, so the regions must not move.
+    if (edit.active_count() == 0) return bad_argument();
     clamp_range(edit.length(), begin, end);
     edit_active(edit, [&](int c, int) {
         return splice(edit.current(c), begin, end, [](SegmentsBuilder &) { return true; });

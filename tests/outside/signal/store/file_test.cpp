@@ -192,6 +192,23 @@ int answer_track(void *parent, int code, void *, void *data2)
     return 1;
 }
 
+TEST(SignalStoreFile, AnEditWithNoActiveChannelMovesNoRegion)
+{
+    const Channels samples = random_channels(2, 44100 * 6, 46);
+    AUDIOSIGNAL *signal = make_signal(samples);
+    AUDIOREGION *region = AUDIOSIGNAL_AddRegionToTrackEx(signal, 0, 4.0, 5.0, "word", nullptr, 0);
+    ASSERT_NE(region, nullptr);
+    AUDIOSIGNAL_DisableChannel(signal, 0);
+    AUDIOSIGNAL_DisableChannel(signal, 1);
+    const uint64_t stamp = AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_CHANGES);
+    // No channel takes part, so nothing is removed: the region must stay over its audio.
+    EXPECT_EQ(AUDIOSIGNAL_ClearEx(signal, 0, 0, 44100), 0);
+    EXPECT_EQ(AUDIOREGION_BeginSample(region), 4 * 44100);
+    EXPECT_EQ(AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_CHANGES), stamp);
+    EXPECT_EQ(read_all(signal), samples);
+    AUDIOSIGNAL_Destroy(signal);
+}
+
 TEST(SignalStoreFile, RegionsMoveWithTheAudio)
 {
     AUDIOSIGNAL *signal = make_signal(random_channels(1, 44100 * 10, 45));
