@@ -12,6 +12,7 @@ struct _audio_signal_pipe {
     _audio_signal *signal;
     int64_t position;                       // where the next frame goes
     std::vector<std::vector<float>> open;   // per channel: frames of the short chunk
+    std::vector<SegmentsPtr> installed;     // the sequences of the last append
 };
 
 extern "C" {
@@ -43,6 +44,11 @@ int64_t AUDIOSIGNAL_AppendToPipe(AUDIOSIGNAL_PIPE *pipe, const float *interleave
     // Edits made while recording may have shortened the signal.
     const int64_t length = current[0]->length();
     pipe->position = std::min(pipe->position, length);
+    // After another change the short chunk may have moved or been edited:
+    // rewriting it would undo that change, so it stays as it is.
+    if (current != pipe->installed) {
+        for (std::vector<float> &open : pipe->open) open.clear();
+    }
     const int64_t open_frames = std::min<int64_t>(int64_t(pipe->open[0].size()), pipe->position);
 
     std::vector<SegmentsPtr> next(channels);
@@ -59,6 +65,7 @@ int64_t AUDIOSIGNAL_AppendToPipe(AUDIOSIGNAL_PIPE *pipe, const float *interleave
         open.erase(open.begin(), open.end() - int64_t(open.size()) % kChunkFrames);
     }
     install_segments(signal, next);
+    pipe->installed = std::move(next);
     if (signal.regions) signal.regions->on_insert(pipe->position, frames);
     pipe->position += frames;
     return frames;

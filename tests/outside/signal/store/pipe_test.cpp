@@ -40,6 +40,25 @@ TEST(SignalStorePipe, FramesAreInsertedAtThePosition)
     AUDIOSIGNAL_Destroy(signal);
 }
 
+TEST(SignalStorePipe, AnEditWhileRecordingIsNotUndoneByTheNextAppend)
+{
+    const Channels start = random_channels(1, 5000, 33);
+    AUDIOSIGNAL *signal = make_signal(start);
+    const Channels first = random_channels(1, 1000, 34), second = random_channels(1, 700, 35);
+    AUDIOSIGNAL_PIPE *pipe = AUDIOSIGNAL_CreatePipe(signal, 100);
+    ASSERT_EQ(AUDIOSIGNAL_AppendToPipe(pipe, first[0].data(), 1000), 1000);
+    // The edit shifts and partly removes what was just recorded.
+    ASSERT_EQ(AUDIOSIGNAL_ClearEx(signal, 0, 50, 150), 1);
+    const Channels edited = read_all(signal);
+    ASSERT_EQ(AUDIOSIGNAL_AppendToPipe(pipe, second[0].data(), 700), 700);
+    EXPECT_EQ(AUDIOSIGNAL_ClosePipe(pipe), 1);
+    // The edited samples stay; the new frames go in at the pipe's position.
+    Channels expected = edited;
+    expected[0].insert(expected[0].begin() + 1100, second[0].begin(), second[0].end());
+    EXPECT_EQ(read_all(signal), expected);
+    AUDIOSIGNAL_Destroy(signal);
+}
+
 TEST(SignalStorePipe, ReadersSeeAConsistentSignalWhileRecording)
 {
     const AUDIO_FORMAT format = format_of(1);
