@@ -259,6 +259,7 @@ int AUDIOSIGNAL_SilenceEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t
 {
     if (!signal) return bad_argument();
     Edit edit(*signal);
+    if (edit.active_count() == 0) return bad_argument();  // nothing to change
     clamp_range(edit.length(), begin, end);
     edit_active(edit, [&](int c, int) {
         return splice(edit.current(c), begin, end, [&](SegmentsBuilder &b) {
@@ -274,6 +275,7 @@ int AUDIOSIGNAL_ReverseEx(AUDIOSIGNAL *signal, int flags, int64_t begin, int64_t
 {
     if (!signal) return bad_argument();
     Edit edit(*signal);
+    if (edit.active_count() == 0) return bad_argument();  // nothing to change
     clamp_range(edit.length(), begin, end);
     const bool ok = edit_active(edit, [&](int c, int) {
         const Segments &source = edit.current(c);

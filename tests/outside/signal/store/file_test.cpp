@@ -204,6 +204,9 @@ TEST(SignalStoreFile, AnEditWithNoActiveChannelMovesNoRegion)
     // No channel takes part, so nothing is removed: the region must stay over its audio.
     EXPECT_EQ(AUDIOSIGNAL_ClearEx(signal, 0, 0, 44100), 0);
     EXPECT_EQ(AUDIOREGION_BeginSample(region), 4 * 44100);
+    // Silence and reverse change nothing either, so they do not claim a change.
+    EXPECT_EQ(AUDIOSIGNAL_SilenceEx(signal, 0, 0, 44100), 0);
+    EXPECT_EQ(AUDIOSIGNAL_ReverseEx(signal, 0, 0, 44100), 0);
     EXPECT_EQ(AUDIOSIGNAL_GetTimeStamp(signal, AUDIOSIGNAL_STAMP_CHANGES), stamp);
     EXPECT_EQ(read_all(signal), samples);
     AUDIOSIGNAL_Destroy(signal);
