@@ -8,8 +8,10 @@
 #include <cctype>
 #include <cerrno>
 #include <charconv>
+#include <climits>
 #include <cmath>
 #include <cstdio>
+#include <cstdlib>
 
 #include "outside/signal/region/region_files.hpp"
 
@@ -148,6 +150,9 @@ AtomicWriter::AtomicWriter(const char *path) : target_(path ? path : ""), error_
         error_ = AUDIO_ERROR_BAD_ARGUMENT;
         return;
     }
+    // Writing over a symbolic link replaces the file it points at, not the link.
+    char real[PATH_MAX];
+    if (::realpath(target_.c_str(), real)) target_ = real;
     temp_ = target_ + ".XXXXXX";
     fd_ = ::mkostemp(temp_.data(), O_CLOEXEC);
     if (fd_ < 0) {

@@ -3,6 +3,9 @@
 #include <gtest/gtest.h>
 #include <sndfile.h>
 
+#include <sys/stat.h>
+#include <unistd.h>
+
 #include <cmath>
 
 #include "outside/signal/region/region_files.hpp"
@@ -174,6 +177,25 @@ TEST_F(WaveCues, RewritingKeepsTheAudioAndOtherChunks)
     EXPECT_STREQ(AUDIOREGION_GetComment(regions[1]), "comment");
     EXPECT_EQ(AUDIOREGION_BeginSample(regions[2]), 8000);
     EXPECT_EQ(dir.names().size(), 1u);
+}
+
+// Regions saved through a symbolic link land in the file it points at; the
+// link stays a link.
+TEST_F(WaveCues, SavingThroughASymbolicLinkUpdatesTheRealFile)
+{
+    write_bytes(path, marked_file());
+    const std::string link = dir.file("link.wav");
+    ASSERT_EQ(symlink("take.wav", link.c_str()), 0);
+
+    set.add(0.1, 0.1, 0, 0, "through the link", nullptr);
+    ASSERT_EQ(velmsig::write_region_file(set, link.c_str(), nullptr), AUDIO_ERROR_NONE);
+
+    struct stat st {};
+    ASSERT_EQ(lstat(link.c_str(), &st), 0);
+    EXPECT_TRUE(S_ISLNK(st.st_mode));
+    EXPECT_NE(read_bytes(path).find("through the link"), std::string::npos);
+    EXPECT_EQ(samples_of(path).size(), 8000u);
+    EXPECT_EQ(dir.names().size(), 2u);
 }
 
 TEST_F(WaveCues, DamagedChunksLoadWhatTheyCan)
