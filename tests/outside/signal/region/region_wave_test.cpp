@@ -198,6 +198,22 @@ TEST_F(WaveCues, SavingThroughASymbolicLinkUpdatesTheRealFile)
     EXPECT_EQ(dir.names().size(), 2u);
 }
 
+// A recording whose RIFF size was never updated from its header-only start
+// still plays; adding cues to it keeps all of its audio.
+TEST_F(WaveCues, AStaleRiffSizeDoesNotCutTheAudio)
+{
+    std::string bytes = riff(audio_chunks());
+    bytes.replace(4, 4, std::string("\x24\0\0\0", 4));   // 36: the header chunks only
+    write_bytes(path, bytes);
+    const std::vector<short> before = samples_of(path);
+    ASSERT_EQ(before.size(), 8000u);
+
+    set.add(0.5, 0.5, 0, 0, "kept", nullptr);
+    ASSERT_EQ(velmsig::write_region_file(set, path.c_str(), nullptr), AUDIO_ERROR_NONE);
+    EXPECT_EQ(samples_of(path), before);
+    EXPECT_NE(read_bytes(path).find("kept"), std::string::npos);
+}
+
 TEST_F(WaveCues, DamagedChunksLoadWhatTheyCan)
 {
     // The cue chunk claims five points but holds two; an adtl entry runs
