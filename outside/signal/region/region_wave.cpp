@@ -58,7 +58,7 @@ public:
         if (error_) return error_;
         struct stat st {};
         if (::fstat(fd_, &st) != 0 || !S_ISREG(st.st_mode)) return AUDIO_ERROR_READ;
-        const uint64_t file_size = uint64_t(st.st_size);
+        const uint64_t file_size = size_ = uint64_t(st.st_size);
         unsigned char head[12];
         if (!read_at(0, head, sizeof head) || std::memcmp(head, "RIFF", 4) != 0 ||
             std::memcmp(head + 8, "WAVE", 4) != 0)
@@ -92,6 +92,7 @@ public:
     }
 
     const std::vector<Chunk> &chunks() const { return chunks_; }
+    uint64_t size() const { return size_; }
 
     bool read_at(uint64_t offset, void *out, size_t size) const
     {
@@ -129,6 +130,7 @@ private:
     int fd_;
     int error_ = AUDIO_ERROR_NONE;
     std::vector<Chunk> chunks_;
+    uint64_t size_ = 0;
 };
 
 bool is_region_chunk(const Chunk &c)
@@ -282,6 +284,8 @@ int write_wave_cues(const char *path, const RegionFileContent &content)
     WaveFile file(path);
     std::vector<std::string> problems;
     if (const int error = file.scan(&problems)) return error;
+    // Its sizes have wrapped: the chunks found do not describe all of it.
+    if (file.size() > UINT32_MAX) return AUDIO_ERROR_WRITE;
     const uint32_t rate = file.sample_rate();
     if (rate == 0) return AUDIO_ERROR_CORRUPT_DATA;
 

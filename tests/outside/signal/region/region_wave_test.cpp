@@ -214,6 +214,21 @@ TEST_F(WaveCues, AStaleRiffSizeDoesNotCutTheAudio)
     EXPECT_NE(read_bytes(path).find("kept"), std::string::npos);
 }
 
+// Past 4 GB a RIFF file's 32-bit sizes have wrapped: cues cannot be written
+// into it, and the refusal leaves the file as it was (sparse here).
+TEST_F(WaveCues, AFileTooBigForRiffSizesIsLeftAlone)
+{
+    write_bytes(path, marked_file());
+    const off_t big = off_t(1) << 32 | 4096;
+    ASSERT_EQ(truncate(path.c_str(), big), 0);
+    set.add(0.5, 0.5, 0, 0, "refused", nullptr);
+    EXPECT_EQ(velmsig::write_region_file(set, path.c_str(), nullptr), AUDIO_ERROR_WRITE);
+    struct stat st {};
+    ASSERT_EQ(stat(path.c_str(), &st), 0);
+    EXPECT_EQ(st.st_size, big);
+    EXPECT_EQ(dir.names().size(), 1u);
+}
+
 TEST_F(WaveCues, DamagedChunksLoadWhatTheyCan)
 {
     // The cue chunk claims five points but holds two; an adtl entry runs
