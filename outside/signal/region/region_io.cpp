@@ -8,8 +8,10 @@
 #include <cctype>
 #include <cerrno>
 #include <charconv>
+#include <climits>
 #include <cmath>
 #include <cstdio>
+#include <cstdlib>
 
 #include "outside/signal/region/region_files.hpp"
 
@@ -148,7 +150,13 @@ AtomicWriter::AtomicWriter(const char *path) : target_(path ? path : ""), error_
         error_ = AUDIO_ERROR_BAD_ARGUMENT;
         return;
     }
-    temp_ = target_ + ".XXXXXX";
+    // Writing over a symbolic link replaces the file it points at, not the link.
+    char real[PATH_MAX];
+    if (::realpath(target_.c_str(), real)) target_ = real;
+    // The temporary name must fit where the target's did (255 bytes).
+    const size_t slash = target_.rfind('/');
+    const size_t name_at = slash == std::string::npos ? 0 : slash + 1;
+    temp_ = target_.substr(0, name_at) + "." + target_.substr(name_at, 200) + ".XXXXXX";
     fd_ = ::mkostemp(temp_.data(), O_CLOEXEC);
     if (fd_ < 0) {
         error_ = open_error(errno, true);

@@ -58,16 +58,18 @@ public:
         if (error_) return error_;
         struct stat st {};
         if (::fstat(fd_, &st) != 0 || !S_ISREG(st.st_mode)) return AUDIO_ERROR_READ;
-        uint64_t file_size = uint64_t(st.st_size);
+        const uint64_t file_size = size_ = uint64_t(st.st_size);
         unsigned char head[12];
         if (!read_at(0, head, sizeof head) || std::memcmp(head, "RIFF", 4) != 0 ||
             std::memcmp(head + 8, "WAVE", 4) != 0)
             return AUDIO_ERROR_UNSUPPORTED_FORMAT;
-        // Bytes after the RIFF body are not ours; a size past the end is.
+        // No chunk starts after the RIFF body, but one that starts inside
+        // runs to its own size: a recording whose RIFF size was never
+        // updated keeps its audio.  A RIFF size past the end is not trusted.
         const uint64_t riff_end = uint64_t(le32(head + 4)) + 8;
-        if (riff_end >= 12 && riff_end < file_size) file_size = riff_end;
+        const uint64_t chunks_end = riff_end >= 12 && riff_end < file_size ? riff_end : file_size;
         uint64_t at = 12;
-        while (at + 8 <= file_size) {
+        while (at + 8 <= chunks_end) {
             if (chunks_.size() >= kMaxChunks) return AUDIO_ERROR_CORRUPT_DATA;
             unsigned char h[8];
             if (!read_at(at, h, sizeof h)) return AUDIO_ERROR_READ;
@@ -90,6 +92,7 @@ public:
     }
 
     const std::vector<Chunk> &chunks() const { return chunks_; }
+    uint64_t size() const { return size_; }
 
     bool read_at(uint64_t offset, void *out, size_t size) const
     {
@@ -127,6 +130,7 @@ private:
     int fd_;
     int error_ = AUDIO_ERROR_NONE;
     std::vector<Chunk> chunks_;
+    uint64_t size_ = 0;
 };
 
 bool is_region_chunk(const Chunk &c)
@@ -280,6 +284,8 @@ int write_wave_cues(const char *path, const RegionFileContent &content)
     WaveFile file(path);
     std::vector<std::string> problems;
     if (const int error = file.scan(&problems)) return error;
+    // Its sizes have wrapped: the chunks found do not describe all of it.
+    if (file.size() > UINT32_MAX) return AUDIO_ERROR_WRITE;
     const uint32_t rate = file.sample_rate();
     if (rate == 0) return AUDIO_ERROR_CORRUPT_DATA;
 

@@ -160,6 +160,17 @@ TEST_F(LabelFiles, MissingFilesAndNamesFail)
               AUDIO_ERROR_FILE_NOT_FOUND);
 }
 
+// The longest name a folder allows still takes a save, and gets its contents.
+TEST_F(LabelFiles, AFileWithTheLongestNameIsSaved)
+{
+    set.add(1.0, 2.0, 0, 0, "long", nullptr);
+    const std::string path = dir.file(std::string(251, 'n') + ".txt");
+    write_bytes(path, "old contents\n");
+    ASSERT_EQ(velmsig::write_region_file(set, path.c_str(), "LABELS"), AUDIO_ERROR_NONE);
+    EXPECT_EQ(read_bytes(path), "1.000000\t2.000000\tlong\n");
+    EXPECT_EQ(dir.names().size(), 1u);
+}
+
 TEST_F(LabelFiles, AFailedWriteLeavesNothingBehind)
 {
     set.add(1.0, 2.0, 0, 0, "x", nullptr);

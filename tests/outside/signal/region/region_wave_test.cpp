@@ -3,6 +3,9 @@
 #include <gtest/gtest.h>
 #include <sndfile.h>
 
+#include <sys/stat.h>
+#include <unistd.h>
+
 #include <cmath>
 
 #include "outside/signal/region/region_files.hpp"
@@ -173,6 +176,56 @@ TEST_F(WaveCues, RewritingKeepsTheAudioAndOtherChunks)
     EXPECT_EQ(AUDIOREGION_EndSample(regions[1]), 5600);
     EXPECT_STREQ(AUDIOREGION_GetComment(regions[1]), "comment");
     EXPECT_EQ(AUDIOREGION_BeginSample(regions[2]), 8000);
+    EXPECT_EQ(dir.names().size(), 1u);
+}
+
+// Regions saved through a symbolic link land in the file it points at; the
+// link stays a link.
+TEST_F(WaveCues, SavingThroughASymbolicLinkUpdatesTheRealFile)
+{
+    write_bytes(path, marked_file());
+    const std::string link = dir.file("link.wav");
+    ASSERT_EQ(symlink("take.wav", link.c_str()), 0);
+
+    set.add(0.1, 0.1, 0, 0, "through the link", nullptr);
+    ASSERT_EQ(velmsig::write_region_file(set, link.c_str(), nullptr), AUDIO_ERROR_NONE);
+
+    struct stat st {};
+    ASSERT_EQ(lstat(link.c_str(), &st), 0);
+    EXPECT_TRUE(S_ISLNK(st.st_mode));
+    EXPECT_NE(read_bytes(path).find("through the link"), std::string::npos);
+    EXPECT_EQ(samples_of(path).size(), 8000u);
+    EXPECT_EQ(dir.names().size(), 2u);
+}
+
+// A recording whose RIFF size was never updated from its header-only start
+// still plays; adding cues to it keeps all of its audio.
+TEST_F(WaveCues, AStaleRiffSizeDoesNotCutTheAudio)
+{
+    std::string bytes = riff(audio_chunks());
+    bytes.replace(4, 4, std::string("\x24\0\0\0", 4));   // 36: the header chunks only
+    write_bytes(path, bytes);
+    const std::vector<short> before = samples_of(path);
+    ASSERT_EQ(before.size(), 8000u);
+
+    set.add(0.5, 0.5, 0, 0, "kept", nullptr);
+    ASSERT_EQ(velmsig::write_region_file(set, path.c_str(), nullptr), AUDIO_ERROR_NONE);
+    EXPECT_EQ(samples_of(path), before);
+    EXPECT_NE(read_bytes(path).find("kept"), std::string::npos);
+}
+
+// Past 4 GB a RIFF file's 32-bit sizes have wrapped: cues cannot be written
+// into it, and the refusal leaves the file as it was (sparse here).
+TEST_F(WaveCues, AFileTooBigForRiffSizesIsLeftAlone)
+{
+    write_bytes(path, marked_file());
+    const off_t big = off_t(1) << 32 | 4096;
+    ASSERT_EQ(truncate(path.c_str(), big), 0);
+    set.add(0.5, 0.5, 0, 0, "refused", nullptr);
+    EXPECT_EQ(velmsig::write_region_file(set, path.c_str(), nullptr), AUDIO_ERROR_WRITE);
+    struct stat st {};
+    ASSERT_EQ(stat(path.c_str(), &st), 0);
+    EXPECT_EQ(st.st_size, big);
     EXPECT_EQ(dir.names().size(), 1u);
 }
 
