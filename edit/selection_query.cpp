@@ -1,5 +1,5 @@
 // Questions about a document's selections.
-#include <cstdlib>
+#include <cstdint>
 
 #include "core/document_internal.hpp"
 #include "core/velmnavigation.h"
@@ -19,6 +19,12 @@ const VELMSELECTION *chunk(VELMAUDIO doc, int index)
     const VELMSELECTION *s = doc->state->selections;
     for (int i = 1; s && i <= index; ++i) s = s->next;
     return s;
+}
+
+// |a - b| without overflow, whatever the two positions are.
+uint64_t distance(int64_t a, int64_t b)
+{
+    return a > b ? static_cast<uint64_t>(a) - static_cast<uint64_t>(b) : static_cast<uint64_t>(b) - static_cast<uint64_t>(a);
 }
 
 } // namespace
@@ -86,7 +92,7 @@ int64_t VELMAUDIO_GetSelectionResizeBorder(VELMAUDIO doc, int64_t sample)
     if (!s || s->next) return VELMAUDIO_GetCursorPosition(doc);
     const int64_t b = VELMSELECTION_GetBegin(doc, s);
     const int64_t e = VELMSELECTION_GetEnd(doc, s);
-    return std::llabs(b - sample) < std::llabs(e - sample) ? e : b;
+    return distance(b, sample) < distance(e, sample) ? e : b;
 }
 
 int64_t VELMAUDIO_GetSelectingAnchor(VELMAUDIO doc)

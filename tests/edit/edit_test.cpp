@@ -235,3 +235,36 @@ TEST_F(Edit, ReadOnlyDocumentsAndBadArguments)
     EXPECT_EQ(VELMAUDIO_Cut(nullptr, nullptr), nullptr);
     EXPECT_FALSE(VELMAUDIO_PasteFromFile(doc, "/no/such/file.wav", "AUTO", nullptr));
 }
+
+TEST_F(Edit, EditsAtTheEndsAndFailedEffectsUndoExactly)
+{
+    const std::vector<float> original = reference;
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 900, 1000));
+    ASSERT_TRUE(VELMAUDIO_AddSelection(doc, 0, 50));
+    ASSERT_TRUE(VELMAUDIO_Trim(doc, nullptr));
+    std::vector<float> expected(original.begin(), original.begin() + 50);
+    expected.insert(expected.end(), original.begin() + 900, original.end());
+    EXPECT_EQ(now(), expected);
+    ASSERT_TRUE(VELMAUDIO_Undo(doc));
+    EXPECT_EQ(now(), original);
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 950, 1000));
+    AUDIOSIGNAL *cut = VELMAUDIO_Cut(doc, nullptr);
+    ASSERT_NE(cut, nullptr);
+    EXPECT_EQ(AUDIOSIGNAL_NumSamples(VELMAUDIO_GetAudioSignal(doc)), 950);
+    EXPECT_LE(VELMAUDIO_GetCursorPosition(doc), 950);
+    VELMAUDIO_SetCursorPosition(doc, 950);
+    ASSERT_TRUE(VELMAUDIO_Paste(doc, cut, nullptr));
+    EXPECT_EQ(now(), original);
+    ASSERT_TRUE(VELMAUDIO_Paste(doc, cut, nullptr));
+    ASSERT_TRUE(VELMAUDIO_Undo(doc));
+    ASSERT_TRUE(VELMAUDIO_Undo(doc));
+    ASSERT_TRUE(VELMAUDIO_Undo(doc));
+    EXPECT_EQ(now(), original);
+    AUDIOSIGNAL_Destroy(cut);
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 100, 200));
+    EXPECT_FALSE(VELMAUDIO_TransformSelection(doc, "NOSUCHEFFECT[x=1]", nullptr));
+    EXPECT_EQ(now(), original);
+    EXPECT_FALSE(VELMAUDIO_Transform(doc, "NOSUCHEFFECT[x=1]", nullptr));
+    EXPECT_EQ(now(), original);
+    EXPECT_EQ(VELMUNDO_Count(doc), 0);
+}

@@ -5,6 +5,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <utility>
 #include <vector>
 
@@ -112,6 +113,9 @@ TEST_F(Sel, InvertAndSelectToStart)
     EXPECT_EQ(VELMAUDIO_GetCursorPosition(doc), 0);
     EXPECT_EQ(VELMAUDIO_GetSelectionResizeBorder(doc, 100), 4000);
     EXPECT_EQ(VELMAUDIO_GetSelectionResizeBorder(doc, 2000), 0); // a tie gives the begin
+    // Pointer samples far outside the signal still pick the farther border.
+    EXPECT_EQ(VELMAUDIO_GetSelectionResizeBorder(doc, INT64_MIN), 4000);
+    EXPECT_EQ(VELMAUDIO_GetSelectionResizeBorder(doc, INT64_MAX), 0);
 }
 
 TEST_F(Sel, VetoesStopTheCommand)
