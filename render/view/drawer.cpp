@@ -13,12 +13,6 @@ using namespace velm::view;
 
 namespace velm::view {
 
-DrawHooks &draw_hooks()
-{
-    static DrawHooks hooks;
-    return hooks;
-}
-
 _VELMRECT make_rect(int32_t left, int32_t top, int32_t width, int32_t height)
 {
     return _VELMRECT{left, top, width, height, left + width - 1, top + height - 1};

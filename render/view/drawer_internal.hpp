@@ -120,28 +120,11 @@ constexpr int kMaxLanes = 3 * VELMDRAW_MAX_CHANNELS;
 // Samples read on each side of the view for the spline (analog mode).
 constexpr int kSplineMargin = 10;
 
-// Steps of the frame that other parts of the renderer draw (scales and
-// regions).  A null entry draws nothing.
-struct DrawHooks {
-    int (*vertScales)(VELMDRAW drawer) = nullptr;
-    int (*horzScale)(VELMDRAW drawer, int first, int last) = nullptr;
-    int (*scaleGrids)(VELMDRAW drawer, int first, int last) = nullptr;
-    // Region layers.  visibleRegions rebuilds the list of regions in view;
-    // trackScales paints the custom tracks' scale areas and trackCanvas their
-    // backgrounds (memory target); regions draws the regions of columns
-    // first .. last into the memory target; regionOnFocus and regionShadows
-    // draw on the output target; changedRegion redraws the regions that
-    // moved or changed length, or answers -1 when only a full redraw can.
-    int (*visibleRegions)(VELMDRAW drawer) = nullptr;
-    int (*trackScales)(VELMDRAW drawer) = nullptr;
-    int (*trackCanvas)(VELMDRAW drawer, int first, int last) = nullptr;
-    int (*regions)(VELMDRAW drawer, int first, int last) = nullptr;
-    int (*regionOnFocus)(VELMDRAW drawer, int first, int last) = nullptr;
-    int (*changedRegion)(VELMDRAW drawer) = nullptr;
-    int (*regionShadows)(VELMDRAW drawer) = nullptr;
-};
-
-DrawHooks &draw_hooks();
+// The scale steps of a frame: the horizontal scale strip (computed and drawn
+// whole, since a scroll moves every label) and the grid lines through the
+// lanes over columns first .. last.
+int draw_horz_scale(VELMDRAW drawer);
+int draw_scale_grids(VELMDRAW drawer, int first, int last);
 
 // Ticks of the horizontal scale: positions origin + k * step that fall on
 // the display (or a little left of it, for labels reaching in).

@@ -11,6 +11,7 @@
 #include "render/view/drawer_internal.hpp"
 #include "render/view/overlay_internal.hpp"
 #include "render/view/velmoverlays.h"
+#include "render/view/velmscales.h"
 
 using namespace velm::view;
 
@@ -36,12 +37,6 @@ constexpr uint32_t kEverything = 0x80001C18u;
 // Larger views cannot be painted (the canvas back-end's limit) and would only
 // size the buffers absurdly.
 constexpr int32_t kMaxViewSize = 32767;
-
-template <typename Hook, typename... Args>
-int call_hook(Hook hook, Args... args)
-{
-    return hook ? hook(args...) : 1;
-}
 
 void reset_dirty(VELMDRAW d)
 {
@@ -89,16 +84,22 @@ int draw_lane_backgrounds(VELMDRAW d, int first, int last, bool main_only)
     return VELMDRAW_DrawCustomCanvas(d, first, last) && ok;
 }
 
+// The "default" track's regions over the lanes, then every track's regions.
+int draw_regions(VELMDRAW d, int first, int last)
+{
+    const int ok = VELMDRAW_DrawRegionsAndCues(d, first, last);
+    return VELMDRAW_DrawCustomTrackRegions(d, first, last) && ok;
+}
+
 // The slow steps for columns first .. last on the memory target.
 int draw_columns(VELMDRAW d, int first, int last, bool main_only)
 {
-    const DrawHooks &hooks = draw_hooks();
     int ok = process_lanes(d, first, last, main_only);
-    ok &= call_hook(hooks.visibleRegions, d);
-    ok &= call_hook(hooks.horzScale, d, first, last);
+    ok &= VELMDRAW_UpdateVisibleRegion(d);
+    ok &= draw_horz_scale(d);
     ok &= draw_lane_backgrounds(d, first, last, main_only);
-    ok &= call_hook(hooks.scaleGrids, d, first, last);
-    ok &= call_hook(hooks.regions, d, first, last);
+    ok &= draw_scale_grids(d, first, last);
+    ok &= draw_regions(d, first, last);
     ok &= draw_lanes(d, first, last, main_only);
     return ok;
 }
@@ -117,25 +118,24 @@ bool prepare_bases(VELMDRAW d)
 
 int full_redraw(VELMDRAW d, uint32_t mask)
 {
-    const DrawHooks &hooks = draw_hooks();
     int ok = VELMDRAW_UpdateDrawAreas(d, 0x80000000u);
     ok &= prepare_bases(d) ? 1 : 0;
-    ok &= call_hook(hooks.visibleRegions, d);
+    ok &= VELMDRAW_UpdateVisibleRegion(d);
     VELMCANVAS_SelectTarget(d->canvas, VELMCANVASTARGET_MEMORY);
     const int last = d->columns - 1;
     ok &= process_lanes(d, 0, last, false);
     if (mask & 0x400u) ok &= VELMDRAW_DrawBackground(d);
-    if (mask & 0x8u) ok &= call_hook(hooks.vertScales, d);
-    ok &= call_hook(hooks.trackScales, d);
-    if (mask & 0x10u) ok &= call_hook(hooks.horzScale, d, 0, last);
+    if (mask & 0x8u) ok &= VELMDRAW_DrawVertScale(d);
+    ok &= VELMDRAW_DrawVertCustomTracks(d);
+    if (mask & 0x10u) ok &= draw_horz_scale(d);
     ok &= draw_lane_backgrounds(d, 0, last, false);
-    ok &= call_hook(hooks.scaleGrids, d, 0, last);
-    ok &= call_hook(hooks.regions, d, 0, last);
+    ok &= draw_scale_grids(d, 0, last);
+    ok &= draw_regions(d, 0, last);
     ok &= draw_lanes(d, 0, last, false);
     ok &= VELMDRAW_DrawChannelSeparators(d);
     ok &= VELMDRAW_FullRedrawFromMemory(d);
     VELMCANVAS_SelectTarget(d->canvas, VELMCANVASTARGET_OUTPUT);
-    ok &= call_hook(hooks.regionOnFocus, d, 0, last);
+    ok &= VELMDRAW_DrawRegionOnFocus(d, 0, last);
     return ok;
 }
 
@@ -154,7 +154,7 @@ int draw_selection_overlays(VELMDRAW d)
 int redraw_focus_layers(VELMDRAW d)
 {
     int ok = VELMDRAW_FullRedrawFromMemory(d);
-    ok &= call_hook(draw_hooks().regionOnFocus, d, 0, d->columns - 1);
+    ok &= VELMDRAW_DrawRegionOnFocus(d, 0, d->columns - 1);
     return draw_selection_overlays(d) && ok;
 }
 
@@ -169,7 +169,6 @@ bool region_held(VELMDRAW d)
 // state the pixels showed before.
 int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
 {
-    const DrawHooks &hooks = draw_hooks();
     VELMCANVAS canvas = d->canvas;
     const int last = d->columns - 1;
     int ok = 1;
@@ -196,7 +195,7 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
         // are drawn there again.
         const _VELMRECT before = d->dirty;
         reset_dirty(d);
-        const int redrawn = call_hook(hooks.changedRegion, d);
+        const int redrawn = VELMDRAW_UpdateChangedRegion(d, &d->state->focusedRegion);
         const _VELMRECT copied = d->dirty;
         d->dirty = before;
         if (copied.right >= copied.left) mark_dirty(d, copied.left, copied.top, copied.right, copied.bottom);
@@ -217,14 +216,14 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
         ok &= VELMDRAW_FullRedrawFromMemory(d);
         ok &= draw_selection_overlays(d);
         break;
-    case 0x4000: ok &= call_hook(hooks.vertScales, d); break;
+    case 0x4000: ok &= VELMDRAW_DrawVertScale(d); break;
     case 0x811: case 0x813:
         ok &= VELMDRAW_UpdateViewWindow(d);
         ok &= VELMDRAW_UpdateNavigator(d);
         ok &= VELMDRAW_DrawChannelSeparators(d);
         ok &= VELMDRAW_FullRedrawFromMemory(d);
         VELMCANVAS_SelectTarget(canvas, VELMCANVASTARGET_OUTPUT);
-        ok &= call_hook(hooks.regionOnFocus, d, 0, d->columns - 1);
+        ok &= VELMDRAW_DrawRegionOnFocus(d, 0, d->columns - 1);
         ok &= draw_selection_overlays(d);
         break;
     default:
@@ -261,7 +260,7 @@ int draw_overlay_tail(VELMDRAW d, bool empty)
         return ok;
     }
     ok &= VELMDRAW_DrawZoomButton(d);
-    ok &= call_hook(draw_hooks().regionShadows, d);
+    ok &= VELMDRAW_DrawCustomTrackRegionShadows(d);
     ok &= VELMDRAW_DrawSelectionsSlider(d, 0, d->columns - 1);
     ok &= draw_navigator_cursor(d, s->cursor);
     ok &= draw_navigator_cursor(d, s->playCursor);

@@ -187,7 +187,7 @@ int VELMDRAW_UpdateChangedRegion(VELMDRAW d, const VELMREGIONCOPY *changed)
     const _VELMRECT clip = make_rect(d->display.left + first, band.top, last - first + 1, band.height);
     VELMCANVAS_SetDrawArea(c, &clip);
     int ok = VELMDRAW_DrawCustomCanvas(d, first, last);
-    if (const auto grids = draw_hooks().scaleGrids) ok &= grids(d, first, last);
+    ok &= draw_scale_grids(d, first, last);
     VELMCANVAS_ClearDrawArea(c);
     ok &= keep_entries(d, now) ? 1 : 0;
     ok &= VELMDRAW_DrawCustomTrackRegions(d, first, last);
