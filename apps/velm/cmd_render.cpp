@@ -28,15 +28,15 @@ using velmtool::RenderArgs;
 const char kUsage[] =
     "usage: velm render [FILE] -o OUT.png [--size WxH] [--lanes waveform|spectrogram|both]\n"
     "                   [--from SECONDS] [--to SECONDS] [--select FROM:TO ...] [--cursor SECONDS]\n"
-    "                   [--regions FILE] [--horz-scale KIND] [--vert-scale KIND] [--spec-scale KIND]\n"
+    "                   [--regions FILE] [--horz-scale KIND] [--vert-scale KIND] [--spectral-scale KIND]\n"
     "                   [--set libvelm.KEY=VALUE ...] [--verbose]\n"
-    "  --select FROM:TO   select FROM .. TO seconds; repeat to select more ranges\n"
-    "  --cursor SECONDS   put the edit cursor there\n"
-    "  --regions FILE     draw the regions of FILE (label text, region file or WAV cues)\n"
-    "  --horz-scale KIND  sample, time, frame, sample_view, time_view or frame_view\n"
-    "  --vert-scale KIND  sample, db, percentual or normalized\n"
-    "  --spec-scale KIND  hz or mels\n"
-    "  --verbose          say on standard error what the document holds before drawing\n";
+    "  --select FROM:TO       select FROM .. TO seconds; repeat to select more ranges\n"
+    "  --cursor SECONDS       put the edit cursor there\n"
+    "  --regions FILE         draw the regions of FILE (label text, region file or WAV cues)\n"
+    "  --horz-scale KIND      sample, time, frame, sample_view, time_view or frame_view\n"
+    "  --vert-scale KIND      sample, db, percentual or normalized\n"
+    "  --spectral-scale KIND  hz or mels\n"
+    "  --verbose              say on standard error what the document holds before drawing\n";
 
 struct CloseDocument {
     void operator()(_VELMAUDIO *doc) const { VELMAUDIO_Close(doc); }

@@ -101,7 +101,7 @@ Took take_render_argument(RenderArgs *args, const char *option, const char *valu
         return value_if(parse_scale(VELMCONFIG_DecodeHorzScaleKind, kHorzScaleProperty, value, args));
     if (std::strcmp(option, "--vert-scale") == 0)
         return value_if(parse_scale(VELMCONFIG_DecodeVertScaleKind, kVertScaleProperty, value, args));
-    if (std::strcmp(option, "--spec-scale") == 0)
+    if (std::strcmp(option, "--spectral-scale") == 0)
         return value_if(parse_scale(VELMCONFIG_DecodeSpecScaleKind, kSpecScaleProperty, value, args));
     if (std::strcmp(option, "--set") == 0) {
         args->settings.push_back(value);

@@ -85,7 +85,7 @@ TEST_F(VelmRenderMarks, ScaleKindsChangeThePicture)
     // Either name of a kind draws the same.
     EXPECT_EQ(render("norm", "--lanes waveform --vert-scale norm"),
               render("normalized", "--lanes waveform --vert-scale normalized"));
-    EXPECT_NE(render("mels", "--lanes spectrogram --spec-scale mels"), render("hz", "--lanes spectrogram --spec-scale hz"));
+    EXPECT_NE(render("mels", "--lanes spectrogram --spectral-scale mels"), render("hz", "--lanes spectrogram --spectral-scale hz"));
 }
 
 TEST_F(VelmRenderMarks, BadMarksAreRefusedAndTheOutputKept)
@@ -94,7 +94,7 @@ TEST_F(VelmRenderMarks, BadMarksAreRefusedAndTheOutputKept)
     std::ofstream(out) << "old picture";
     const std::string base = "render " + sound + " -o " + out + " ";
     for (const char *options : {"--select 2:1", "--select 1", "--select a:b", "--select 1:1", "--horz-scale minutes",
-                                "--vert-scale ''", "--spec-scale HZ", "--cursor -1", "--cursor soon", "--regions ''",
+                                "--vert-scale ''", "--spectral-scale HZ", "--cursor -1", "--cursor soon", "--regions ''",
                                 "--regions"})
         velmtest::expect_failure(base + options, 2, "cannot use the argument");
 
