@@ -13,6 +13,7 @@
 #include "edit/velmregion.h"
 #include "edit/velmundo.h"
 #include "outside/signal/audiosignal.h"
+#include "sound/recorder_guard.hpp"
 
 namespace {
 
@@ -141,6 +142,7 @@ void copy_text(char *buffer, size_t size, const char *text)
 int close_document(VELMAUDIO doc)
 {
     UnRegisterObject(doc);
+    end_document_recordings(doc);
     if (doc->dispatcher) {
         BLNOTIFY_DestroyDispatcher(doc->dispatcher);
         doc->dispatcher = nullptr;
@@ -397,6 +399,8 @@ AUDIOSIGNAL *VELMAUDIO_SetAudioSignal(VELMAUDIO doc, AUDIOSIGNAL *signal)
 {
     if (!doc) return nullptr;
     AUDIOSIGNAL *previous = doc->signal;
+    // A signal the document lets go of may be freed next: nothing may record into it.
+    velm::end_signal_recordings(previous);
     if (previous) AUDIOSIGNAL_SetParentObject(previous, nullptr, nullptr);
     doc->signal = signal;
     if (signal) AUDIOSIGNAL_SetParentObject(signal, doc, velm::signal_callback);

@@ -8,6 +8,7 @@
 #include "core/velmqueries.h"
 #include "core/velmtimeconv.h"
 #include "edit/edit_internal.hpp"
+#include "sound/velmrecord.h"
 
 namespace {
 
@@ -150,6 +151,8 @@ int VELMAUDIO_ChangeAudioFormat(VELMAUDIO doc, const _audio_format *format, cons
                                 wanted.numChannels, mix.c_str(), quant.c_str());
     if (n < 0 || static_cast<size_t>(n) >= effect.size()) return 0;
     effect.resize(static_cast<size_t>(n));
+    // Frames recorded during the conversion would be lost from its result.
+    if (VELMAUDIO_IsRecording(doc) && !VELMAUDIO_RecordStop(doc)) return 0;
 
     if (!VELMAUDIO_Transform(doc, effect.c_str(), label ? label : "Change Audio Format")) return 0;
     if (wanted.sampleRate == current.sampleRate) return 1;

@@ -1,0 +1,245 @@
+// How a recording is started, followed, vetoed, stopped and torn down, as
+// the shell sees it.
+#include "core/velmnavigation.h"
+#include "edit/velmedit.h"
+#include "edit/velmundo.h"
+#include "recorder_support.hpp"
+
+namespace {
+
+using rectest::EventProbe;
+using rectest::kCaptureFrames;
+using rectest::kRate;
+
+class RecordControl : public rectest::Recording {};
+
+TEST_F(RecordControl, TheViewFollowsTheRecording)
+{
+    VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 200000));
+    ASSERT_NE(doc, nullptr);
+    VELMAUDIO_SetCursorPosition(doc, 200000);
+    ASSERT_EQ(VELMAUDIO_Zoom(doc, 0, 1000), 1);
+    EventProbe positions(doc, VELMRECORD_NOTIFY_POSITION);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(r, nullptr);
+    const VELMSTATE *state = VELMAUDIO_GetState(doc);
+    ASSERT_TRUE(pump_until([state] { return state->recordPosition > 200000 + 1000; }));
+    EXPECT_EQ(state->recordStart, 200000);
+    EXPECT_EQ(state->viewEnd, state->recordPosition);
+    EXPECT_GE(positions.count, 2); // the start, then the updates
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+}
+
+TEST_F(RecordControl, PositionEventsInsteadOfViewMoves)
+{
+    VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 200000));
+    ASSERT_NE(doc, nullptr);
+    VELMAUDIO_SetCursorPosition(doc, 200000);
+    ASSERT_EQ(VELMAUDIO_Zoom(doc, 0, 100000), 1);
+    EventProbe positions(doc, VELMRECORD_NOTIFY_POSITION);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, VELMRECORD_FLAG_NOTIFY_POSITION, nullptr);
+    ASSERT_NE(r, nullptr);
+    const VELMSTATE *state = VELMAUDIO_GetState(doc);
+    const int64_t begin = state->viewBegin, end = state->viewEnd;
+    ASSERT_TRUE(pump_until([&positions] { return positions.count >= 3; }));
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+
+    EXPECT_EQ(state->viewBegin, begin);
+    EXPECT_EQ(state->viewEnd, end);
+    // The first event announces the start; the timer's carry the recorder.
+    EXPECT_EQ(positions.positions[0], 200000);
+    EXPECT_EQ(positions.data2[0], nullptr);
+    for (size_t i = 1; i < positions.positions.size(); ++i) {
+        EXPECT_EQ(positions.data2[i], static_cast<void *>(r));
+        EXPECT_GT(positions.positions[i], positions.positions[i - 1]);
+    }
+}
+
+TEST_F(RecordControl, AVetoedStartRecordsNothing)
+{
+    VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 1000));
+    ASSERT_NE(doc, nullptr);
+    EventProbe refuse(doc, VELMRECORD_NOTIFY_START, 0);
+    EventProbe destroyed(doc, VELMRECORD_NOTIFY_DESTROYED);
+    EXPECT_EQ(VELMAUDIO_RecordStart(doc, VELMRECORD_FLAG_UNDO, "Record"), nullptr);
+    EXPECT_EQ(refuse.count, 1);
+    EXPECT_EQ(destroyed.count, 1);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
+    EXPECT_EQ(VELMUNDO_Count(doc), 0);
+    pump();
+    EXPECT_EQ(VELMAUDIO_NumSamples(doc), 1000);
+    EXPECT_EQ(VELMAUDIO_GetState(doc)->recordStart, -1);
+}
+
+TEST_F(RecordControl, QuietRecordingsAreNotAnnounced)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    EventProbe refuse_start(doc, VELMRECORD_NOTIFY_START, 0);
+    EventProbe refuse_stop(doc, VELMRECORD_NOTIFY_STOP, 0);
+    ASSERT_NE(VELMAUDIO_RecordStart(doc, VELMRECORD_FLAG_QUIET, nullptr), nullptr);
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+    EXPECT_EQ(refuse_start.count + refuse_stop.count, 0);
+}
+
+TEST_F(RecordControl, AVetoedStopKeepsRecording)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(r, nullptr);
+    {
+        EventProbe refuse(doc, VELMRECORD_NOTIFY_STOP, 0);
+        EXPECT_EQ(VELMAUDIO_RecordStop(doc), 0);
+        EXPECT_EQ(refuse.count, 1);
+        EXPECT_EQ(refuse.data1[0], static_cast<void *>(r));
+        // A format change that cannot stop the recording does not happen.
+        _audio_format wider{kRate, 2, 16, 0, 0};
+        EXPECT_EQ(VELMAUDIO_ChangeAudioFormat(doc, &wider, nullptr, nullptr, 0, 0, nullptr), 0);
+        EXPECT_EQ(AUDIOSIGNAL_NumChannels(VELMAUDIO_GetAudioSignal(doc)), 1);
+    }
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 1);
+    const int64_t now = VELMRECORD_RecordPosition(r);
+    EXPECT_TRUE(record_until(r, now + 1000));
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+}
+
+TEST_F(RecordControl, PauseIsRefusedAndRecordingGoesOn)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(r, nullptr);
+    EXPECT_EQ(VELMRECORD_ChangeDevice(r, "Virtual Device"), 1);
+    EXPECT_EQ(VELMRECORD_Pause(r), 0);
+    EXPECT_EQ(VELMRECORD_IsPaused(r), 0);
+    EXPECT_EQ(VELMRECORD_IsRecording(r), 1);
+    const int64_t now = VELMRECORD_RecordPosition(r);
+    EXPECT_TRUE(record_until(r, now + 1000));
+    EXPECT_EQ(VELMRECORD_Resume(r), 0);
+    EXPECT_EQ(VELMRECORD_AddEffect(r, "invert"), 0);
+    EXPECT_EQ(VELMRECORD_RemoveEffect(r, "invert"), 0);
+    EXPECT_EQ(VELMRECORD_CreateFileRecorder(dir.file("x.wav").c_str(), "WAVE"), nullptr);
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+}
+
+TEST_F(RecordControl, ClosingTheDocumentWhileRecordingEndsIt)
+{
+    const _audio_format format{kRate, 1, 16, 0, 0};
+    VELMAUDIO doc = VELMAUDIO_New(&format);
+    ASSERT_NE(doc, nullptr);
+    const int objects = CountRegisteredObjects();
+    int destroyed = 0;
+    auto count = [](const BLNotifyEvent *event, void *user) {
+        if (event->event == VELMRECORD_NOTIFY_DESTROYED) ++*static_cast<int *>(user);
+        return 1;
+    };
+    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), count, &destroyed);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(r, nullptr);
+    EXPECT_EQ(CountRegisteredObjects(), objects + 1);
+    ASSERT_TRUE(record_until(r, 2000));
+    EXPECT_EQ(VELMAUDIO_Close(doc), 1);
+    EXPECT_EQ(destroyed, 1);
+    EXPECT_EQ(CountRegisteredObjects(), objects - 1);
+    EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 0);
+    pump(); // a capture thread still writing would touch freed memory here
+}
+
+TEST_F(RecordControl, UndoWhileRecordingEndsTheRecording)
+{
+    VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 1000));
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, VELMRECORD_FLAG_UNDO, "Record");
+    ASSERT_NE(r, nullptr);
+    ASSERT_TRUE(record_until(r, 2000));
+    ASSERT_EQ(VELMAUDIO_Undo(doc), 1);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
+    EXPECT_EQ(VELMAUDIO_GetState(doc)->recordStart, -1);
+    pump();
+    EXPECT_EQ(VELMAUDIO_NumSamples(doc), 1000);
+}
+
+TEST_F(RecordControl, ANewStartReplacesTheRunningRecorder)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    EventProbe destroyed(doc, VELMRECORD_NOTIFY_DESTROYED);
+    VELMRECORDER first = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(first, nullptr);
+    ASSERT_NE(VELMAUDIO_RecordStart(doc, 0, nullptr), nullptr);
+    EXPECT_EQ(destroyed.count, 1);
+    EXPECT_EQ(destroyed.data1[0], static_cast<void *>(first));
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 1);
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 0);
+}
+
+TEST_F(RecordControl, ADocumentLinksOneRecorder)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER running = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(running, nullptr);
+    VELMRECORDER spare = VELMRECORD_CreateRecorder(doc, 0, 0);
+    ASSERT_NE(spare, nullptr);
+    EXPECT_EQ(VELMAUDIO_LinkRecorder(doc, spare), 0);
+    EXPECT_EQ(VELMAUDIO_UnlinkRecorder(doc, spare), 0);
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+    // A linked recorder that never started is released by the stop.
+    EXPECT_EQ(VELMAUDIO_LinkRecorder(doc, spare), 1);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 1);
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
+    EXPECT_EQ(VELMRECORD_DestroyRecorder(spare), 0);
+}
+
+TEST_F(RecordControl, RecordersAreDestroyedOnce)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMRECORD_CreateRecorder(doc, VELMRECORD_FLAG_SILENT_DESTROY, 0);
+    ASSERT_NE(r, nullptr);
+    EventProbe destroyed(doc, VELMRECORD_NOTIFY_DESTROYED);
+    EXPECT_EQ(VELMRECORD_GetStatus(r), VELMRECORD_STATUS_CREATED);
+    EXPECT_EQ(VELMRECORD_RecordPosition(r), -1);
+    EXPECT_EQ(VELMRECORD_Stop(r), 0);
+    EXPECT_EQ(VELMRECORD_ChangeDevice(r, "Virtual Device"), 0);
+    EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 1);
+    EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 0);
+    EXPECT_EQ(destroyed.count, 0);
+}
+
+TEST_F(RecordControl, ARecorderNeedsAnEditableSignal)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMAUDIO_SetEditable(doc, 0);
+    EXPECT_EQ(VELMRECORD_CreateRecorder(doc, 0, 0), nullptr);
+    EXPECT_EQ(VELMAUDIO_RecordStart(doc, 0, nullptr), nullptr);
+    VELMAUDIO link = VELMAUDIO_CreateUnresolvedLink();
+    EXPECT_EQ(VELMAUDIO_RecordStart(link, 0, nullptr), nullptr);
+    EXPECT_EQ(VELMAUDIO_SetStartRecordPosition(link, 0), 0);
+    VELMAUDIO_Close(link);
+}
+
+TEST_F(RecordControl, NullHandlesAreRefused)
+{
+    EXPECT_EQ(VELMRECORD_CreateRecorder(nullptr, 0, 0), nullptr);
+    EXPECT_EQ(VELMRECORD_Start(nullptr, "x"), 0);
+    EXPECT_EQ(VELMRECORD_Stop(nullptr), 0);
+    EXPECT_EQ(VELMRECORD_DestroyRecorder(nullptr), 0);
+    EXPECT_EQ(VELMRECORD_RecordPosition(nullptr), -1);
+    EXPECT_EQ(VELMRECORD_IsRecording(nullptr), 0);
+    EXPECT_EQ(VELMRECORD_SetGUITimer(nullptr, nullptr, nullptr), 0);
+    EXPECT_EQ(VELMRECORD_ChangeDevice(nullptr, "Virtual Device"), 0);
+    EXPECT_EQ(VELMAUDIO_RecordStart(nullptr, 0, nullptr), nullptr);
+    EXPECT_EQ(VELMAUDIO_RecordStop(nullptr), 0);
+    EXPECT_EQ(VELMAUDIO_IsRecording(nullptr), 0);
+    EXPECT_EQ(VELMAUDIO_LinkRecorder(nullptr, nullptr), 0);
+    EXPECT_EQ(VELMAUDIO_UnlinkRecorder(nullptr, nullptr), 0);
+    EXPECT_EQ(VELMAUDIO_SetRecordPosition(nullptr, 1), 0);
+    EXPECT_EQ(VELMAUDIO_SetStopRecordPosition(nullptr), 0);
+}
+
+} // namespace
