@@ -142,7 +142,6 @@ void copy_text(char *buffer, size_t size, const char *text)
 int close_document(VELMAUDIO doc)
 {
     UnRegisterObject(doc);
-    end_document_recordings(doc);
     if (doc->dispatcher) {
         BLNOTIFY_DestroyDispatcher(doc->dispatcher);
         doc->dispatcher = nullptr;
@@ -302,6 +301,8 @@ static int release_reference(VELMAUDIO doc)
     MutexUnlock(doc->referenceLock);
     if (left >= 1) return 0;
 
+    // Stopped first, so that what was recorded counts as a change below.
+    velm::end_document_recordings(doc);
     if (doc->state->status & STATUS_MODIFIED) {
         const int answer = BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x20009, doc, nullptr);
         if (answer != 1) {
@@ -316,6 +317,7 @@ static int release_reference(VELMAUDIO doc)
 
 static int unload(VELMAUDIO doc)
 {
+    velm::end_document_recordings(doc);
     VELMSTATE *state = doc->state;
     if (!(state->status & STATUS_HAS_FILE) || (state->status & STATUS_MODIFIED) || doc->drawing) return 0;
     VELMDRAW_Destroy(doc->renderer);

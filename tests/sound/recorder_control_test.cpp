@@ -129,21 +129,44 @@ TEST_F(RecordControl, ClosingTheDocumentWhileRecordingEndsIt)
     VELMAUDIO doc = VELMAUDIO_New(&format);
     ASSERT_NE(doc, nullptr);
     const int objects = CountRegisteredObjects();
-    int destroyed = 0;
+    struct Seen {
+        int destroyed = 0;
+        int askedToSave = 0;
+    } seen;
     auto count = [](const BLNotifyEvent *event, void *user) {
-        if (event->event == VELMRECORD_NOTIFY_DESTROYED) ++*static_cast<int *>(user);
+        auto *s = static_cast<Seen *>(user);
+        if (event->event == VELMRECORD_NOTIFY_DESTROYED) ++s->destroyed;
+        if (event->event == 0x20009) ++s->askedToSave;
         return 1;
     };
-    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), count, &destroyed);
+    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), count, &seen);
     VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
     ASSERT_NE(r, nullptr);
     EXPECT_EQ(CountRegisteredObjects(), objects + 1);
     ASSERT_TRUE(record_until(r, 2000));
     EXPECT_EQ(VELMAUDIO_Close(doc), 1);
-    EXPECT_EQ(destroyed, 1);
+    EXPECT_EQ(seen.destroyed, 1);
+    EXPECT_EQ(seen.askedToSave, 1); // the recorded frames are unsaved changes
     EXPECT_EQ(CountRegisteredObjects(), objects - 1);
     EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 0);
     pump(); // a capture thread still writing would touch freed memory here
+}
+
+TEST_F(RecordControl, UnloadingWhileRecordingKeepsWhatWasRecorded)
+{
+    VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 1000));
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(r, nullptr);
+    ASSERT_TRUE(record_until(r, 3000));
+    // The recording ends; the document now has changes and stays loaded.
+    EXPECT_EQ(VELMAUDIO_CloseEx(doc, 1), 0);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
+    EXPECT_EQ(VELMAUDIO_IsOpen(doc), 1);
+    const int64_t length = VELMAUDIO_NumSamples(doc);
+    EXPECT_GE(length, 3000);
+    pump();
+    EXPECT_EQ(VELMAUDIO_NumSamples(doc), length);
 }
 
 TEST_F(RecordControl, UndoWhileRecordingEndsTheRecording)
