@@ -1,6 +1,7 @@
 // Recorder lifecycle: settings, creation, destruction, queries, and the
 // recorders a document or a signal must end before it goes away.
 #include <algorithm>
+#include <cmath>
 #include <vector>
 
 #include "core/velmqueries.h"
@@ -9,10 +10,24 @@
 
 namespace {
 
+constexpr double kDefaultBufferTime = 0.05;
+constexpr double kDefaultViewWindow = 30.0;
 // Buffer times outside this range are taken as its nearest end: a device
-// cannot keep up below it, and above it a block no longer fits the buffer.
+// cannot keep up below it, and above it the device's ring grows absurd.
 constexpr double kMinBufferTime = 0.005;
 constexpr double kMaxBufferTime = 2.0;
+
+double buffer_time_setting()
+{
+    const double t = BLSETTINGS_GetFloatEx(nullptr, "libvelm.record.osbuffersize=[%f]", kDefaultBufferTime);
+    return std::isfinite(t) ? std::clamp(t, kMinBufferTime, kMaxBufferTime) : kDefaultBufferTime;
+}
+
+double view_window_setting()
+{
+    const double t = BLSETTINGS_GetFloatEx(nullptr, "libvelm.record.viewwindowtime=[%f]", kDefaultViewWindow);
+    return std::isfinite(t) && t > 0 ? t : kDefaultViewWindow;
+}
 
 // Live recorders, so that a document can end those that write into it.
 // Created, destroyed and looked up on the shell's thread only.
@@ -60,10 +75,10 @@ void end_signal_recordings(const AUDIOSIGNAL *signal)
 
 int VELMRECORD_Initialize(void)
 {
-    const int changed = VELMSOUND_Initialize();
-    BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.viewwindowtime=%d", 30);
-    BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.osbuffersize=%f", 0.05);
-    return changed;
+    VELMSOUND_Initialize();
+    BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.viewwindowtime=%d", static_cast<int>(kDefaultViewWindow));
+    BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.osbuffersize=%f", kDefaultBufferTime);
+    return 1;
 }
 
 void VELMRECORD_Finalize(void)
@@ -102,9 +117,8 @@ VELMRECORDER VELMRECORD_CreateRecorder(VELMAUDIO doc, uint32_t flags, int64_t po
     r->updateUser = r;
     r->buffer = buffer;
     r->capacity = velm::kRecordBufferSamples;
-    r->bufferTime = static_cast<float>(std::clamp(
-        BLSETTINGS_GetFloatEx(nullptr, "libvelm.record.osbuffersize=[%f]", 0.05), kMinBufferTime, kMaxBufferTime));
-    r->viewWindow = static_cast<float>(BLSETTINGS_GetFloatEx(nullptr, "libvelm.record.viewwindowtime=[%f]", 30.0));
+    r->bufferTime = static_cast<float>(buffer_time_setting());
+    r->viewWindow = static_cast<float>(view_window_setting());
     live_recorders().push_back(r);
     RegisterObject(r, 0, dispose_recorder);
     return r;

@@ -55,6 +55,25 @@ TEST_F(RecordControl, PositionEventsInsteadOfViewMoves)
     }
 }
 
+TEST_F(RecordControl, TheShellMayTakeOverTheTimer)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMRECORD_CreateRecorder(doc, 0, 0);
+    ASSERT_NE(r, nullptr);
+    int ticks = 0;
+    auto tick = [](void *user) { return ++*static_cast<int *>(user); };
+    ASSERT_EQ(VELMRECORD_SetGUITimer(r, tick, &ticks), 1);
+    ASSERT_EQ(VELMRECORD_Start(r, nullptr), 1);
+    EXPECT_EQ(VELMRECORD_SetGUITimer(r, nullptr, nullptr), 0);
+    ASSERT_TRUE(pump_until([&ticks] { return ticks >= 2; }));
+    // The recorder's own update no longer runs: the range stays at its start.
+    EXPECT_EQ(VELMAUDIO_GetState(doc)->recordPosition, 0);
+    EXPECT_GT(VELMRECORD_RecordPosition(r), 0);
+    EXPECT_EQ(VELMRECORD_Stop(r), 1);
+    EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 1);
+}
+
 TEST_F(RecordControl, AVetoedStartRecordsNothing)
 {
     VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 1000));
@@ -215,6 +234,22 @@ TEST_F(RecordControl, ADocumentLinksOneRecorder)
     EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
     EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
     EXPECT_EQ(VELMRECORD_DestroyRecorder(spare), 0);
+}
+
+TEST_F(RecordControl, SettingsHaveDefaultsAndAbsurdBufferTimesAreBounded)
+{
+    EXPECT_EQ(BLSETTINGS_GetIntEx(nullptr, "libvelm.record.viewwindowtime"), 30);
+    EXPECT_DOUBLE_EQ(BLSETTINGS_GetFloatEx(nullptr, "libvelm.record.osbuffersize"), 0.05);
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    for (const char *time : {"1e9", "-1", "nan"}) {
+        BLSETTINGS_ChangeEx(nullptr, "libvelm.record.osbuffersize=%s", time);
+        VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+        ASSERT_NE(r, nullptr) << time;
+        EXPECT_TRUE(record_until(r, 1000)) << time;
+        EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+    }
+    BLSETTINGS_DeleteEx(nullptr, "libvelm.record.osbuffersize");
 }
 
 TEST_F(RecordControl, RecordersAreDestroyedOnce)
