@@ -51,12 +51,12 @@ int32_t recorder_capture(void *user, void *data, int32_t bytes)
 {
     auto *r = static_cast<VELMRECORDER>(user);
     if (!r || !data || bytes <= 0) return bytes;
+    MutexLock(r->lock);
     const int channels = r->captureFormat.numChannels;
     // Whole frames only, and at most the buffer's first half at a time.
     const int64_t chunk = std::max<int64_t>(channels, (r->capacity / 8) / channels * channels);
     const int64_t samples = bytes / 2 / channels * channels;
     const auto *pcm = static_cast<const int16_t *>(data);
-    MutexLock(r->lock);
     for (int64_t done = 0; r->pipe && done < samples;) {
         const int64_t n = std::min(chunk, samples - done);
         AUDIO_Word16ToFloatIEEE(pcm + done, r->buffer, static_cast<int>(n));
