@@ -107,52 +107,72 @@ snd_pcm_uframes_t Configure(snd_pcm_t *pcm, const _audio_format &format, snd_pcm
     return ok && snd_pcm_prepare(pcm) >= 0 ? buffer : 0;
 }
 
-class AlsaPlayback final : public PlaybackEndpoint {
-public:
-    AlsaPlayback(Pcm pcm, snd_pcm_uframes_t frames, int channels)
-        : pcm_(std::move(pcm)), block_(2u * channels), ring_bytes_(static_cast<uint32_t>(frames) * block_)
+// An open, configured PCM as both directions keep it.
+struct AlsaStream {
+    AlsaStream(Pcm p, snd_pcm_uframes_t frames, int channels)
+        : pcm(std::move(p)), block(2u * channels), ring_bytes(static_cast<uint32_t>(frames) * block)
     {
     }
 
-    uint32_t RingBytes() const override { return ring_bytes_; }
+    Pcm pcm;
+    const uint32_t block;
+    const uint32_t ring_bytes;
+    std::mutex lock;
+    bool running = false;
+};
+
+class AlsaPlayback final : public PlaybackEndpoint, private AlsaStream {
+public:
+    using AlsaStream::AlsaStream;
+
+    uint32_t RingBytes() const override { return ring_bytes; }
+    // A PCM without data yet starts when its first frames arrive (Flush).
     bool Start() override
     {
-        std::lock_guard guard(lock_);
-        const snd_pcm_state_t state = snd_pcm_state(pcm_.get());
-        const int err = state == SND_PCM_STATE_PAUSED ? snd_pcm_pause(pcm_.get(), 0) : snd_pcm_start(pcm_.get());
-        running_ = err >= 0;
-        return running_;
+        std::lock_guard guard(lock);
+        const snd_pcm_state_t state = snd_pcm_state(pcm.get());
+        int err = 0;
+        if (state == SND_PCM_STATE_PAUSED)
+            err = snd_pcm_pause(pcm.get(), 0);
+        else if (handed_ > 0)
+            err = snd_pcm_start(pcm.get());
+        running = err >= 0;
+        return running;
     }
     bool Pause() override
     {
-        std::lock_guard guard(lock_);
-        if (snd_pcm_pause(pcm_.get(), 1) < 0) return false;
-        running_ = false;
+        std::lock_guard guard(lock);
+        if (snd_pcm_pause(pcm.get(), 1) < 0) return false;
+        running = false;
         return true;
     }
+    // Keeps the position reached; what was still queued is never heard.
     void Stop() override
     {
-        std::lock_guard guard(lock_);
-        snd_pcm_drop(pcm_.get());
-        running_ = false;
+        Played();
+        std::lock_guard guard(lock);
+        snd_pcm_drop(pcm.get());
+        running = false;
+        stopped_ = true;
     }
     int64_t Played() override
     {
-        std::lock_guard guard(lock_);
+        std::lock_guard guard(lock);
+        if (stopped_) return played_ * block;
         Flush();
         snd_pcm_sframes_t delay = 0;
-        const int err = snd_pcm_delay(pcm_.get(), &delay);
+        const int err = snd_pcm_delay(pcm.get(), &delay);
         if (err < 0) {
             Recover(err);
             delay = 0;
         }
         const int64_t heard = handed_ - std::clamp<int64_t>(delay, 0, handed_);
         played_ = std::max(played_, heard);
-        return played_ * block_;
+        return played_ * block;
     }
     bool Write(const uint8_t *data, uint32_t bytes) override
     {
-        std::lock_guard guard(lock_);
+        std::lock_guard guard(lock);
         pending_.insert(pending_.end(), data, data + bytes);
         Flush();
         return true;
@@ -162,76 +182,62 @@ private:
     // Hands over the whole frames the PCM has room for.
     void Flush()
     {
-        while (pending_.size() >= block_) {
-            const snd_pcm_sframes_t n = snd_pcm_writei(pcm_.get(), pending_.data(), pending_.size() / block_);
-            if (n == -EAGAIN || n == 0) return;
+        while (pending_.size() >= block) {
+            const snd_pcm_sframes_t n = snd_pcm_writei(pcm.get(), pending_.data(), pending_.size() / block);
+            if (n == -EAGAIN || n == 0) break;
             if (n < 0) {
-                if (!Recover(static_cast<int>(n))) return;
+                if (!Recover(static_cast<int>(n))) break;
                 continue;
             }
-            pending_.erase(pending_.begin(), pending_.begin() + n * block_);
+            pending_.erase(pending_.begin(), pending_.begin() + n * block);
             handed_ += n;
         }
-        if (running_ && snd_pcm_state(pcm_.get()) == SND_PCM_STATE_PREPARED) snd_pcm_start(pcm_.get());
+        if (running && snd_pcm_state(pcm.get()) == SND_PCM_STATE_PREPARED) snd_pcm_start(pcm.get());
     }
 
     // After an underrun the PCM is prepared again; what was queued counts
     // as heard, and a running stream starts again with the next data.
     bool Recover(int err)
     {
-        if (snd_pcm_recover(pcm_.get(), err, 1) < 0) return false;
+        if (snd_pcm_recover(pcm.get(), err, 1) < 0) return false;
         played_ = handed_;
         return true;
     }
 
-    Pcm pcm_;
-    const uint32_t block_;
-    const uint32_t ring_bytes_;
-    std::mutex lock_;
     std::vector<uint8_t> pending_;
     int64_t handed_ = 0; // frames
     int64_t played_ = 0; // frames
-    bool running_ = false;
+    bool stopped_ = false;
 };
 
-class AlsaCapture final : public CaptureEndpoint {
+class AlsaCapture final : public CaptureEndpoint, private AlsaStream {
 public:
-    AlsaCapture(Pcm pcm, snd_pcm_uframes_t frames, int channels)
-        : pcm_(std::move(pcm)), block_(2u * channels), ring_bytes_(static_cast<uint32_t>(frames) * block_)
-    {
-    }
+    using AlsaStream::AlsaStream;
 
-    uint32_t RingBytes() const override { return ring_bytes_; }
+    uint32_t RingBytes() const override { return ring_bytes; }
     bool Start() override
     {
-        std::lock_guard guard(lock_);
-        running_ = snd_pcm_start(pcm_.get()) >= 0;
-        return running_;
+        std::lock_guard guard(lock);
+        running = snd_pcm_start(pcm.get()) >= 0;
+        return running;
     }
     void Stop() override
     {
-        std::lock_guard guard(lock_);
-        snd_pcm_drop(pcm_.get());
-        running_ = false;
+        std::lock_guard guard(lock);
+        snd_pcm_drop(pcm.get());
+        running = false;
     }
     int64_t Read(uint8_t *buffer, uint32_t max) override
     {
-        std::lock_guard guard(lock_);
-        if (!running_) return 0;
-        const snd_pcm_sframes_t n = snd_pcm_readi(pcm_.get(), buffer, max / block_);
-        if (n >= 0) return n * block_;
+        std::lock_guard guard(lock);
+        if (!running) return 0;
+        const snd_pcm_sframes_t n = snd_pcm_readi(pcm.get(), buffer, max / block);
+        if (n >= 0) return n * block;
         if (n == -EAGAIN) return 0;
         // An overrun loses what the PCM could not keep; capture goes on.
-        if (snd_pcm_recover(pcm_.get(), static_cast<int>(n), 1) < 0 || snd_pcm_start(pcm_.get()) < 0) return -1;
+        if (snd_pcm_recover(pcm.get(), static_cast<int>(n), 1) < 0 || snd_pcm_start(pcm.get()) < 0) return -1;
         return 0;
     }
-
-private:
-    Pcm pcm_;
-    const uint32_t block_;
-    const uint32_t ring_bytes_;
-    std::mutex lock_;
-    bool running_ = false;
 };
 
 template <class Endpoint>

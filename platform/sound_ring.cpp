@@ -63,7 +63,6 @@ public:
           ring_(endpoint_->RingBytes() / block_ * block_), scratch_(ring_),
           period_(RealPeriod(std::round(buffer_time * 4.0 * 1000.0 * 0.125), endpoint_->Speed()))
     {
-        Fill();
         worker_.thread = std::thread([this] { Run(); });
     }
     ~PlaybackRing()

@@ -1,7 +1,8 @@
 // Playback and capture streams over an endpoint: the playback ring holds
 // four buffer times and is refilled by one worker thread every eighth of
 // it; the capture ring holds a hundred buffer times and is drained by its
-// worker at most every 200 ms.  Stream callbacks run on the worker.
+// worker at most every 200 ms.  Stream callbacks run on the worker only,
+// which fills the playback ring as soon as the stream opens.
 #ifndef VELMPLATFORM_SOUND_RING_HPP
 #define VELMPLATFORM_SOUND_RING_HPP
 

@@ -7,16 +7,6 @@ using namespace soundtest;
 
 namespace {
 
-struct Log {
-    static void Sink(int kind, int, const char *message, void *self)
-    {
-        if (kind == BLDEBUG_KIND_ERROR) static_cast<Log *>(self)->errors.emplace_back(message);
-    }
-    Log() { BLDEBUG_SetSink(&Log::Sink, this); }
-    ~Log() { BLDEBUG_SetSink(nullptr, nullptr); }
-    std::vector<std::string> errors;
-};
-
 const VELMSOUNDDEVICEINFO *Info(VELMSOUNDDEVICE device)
 {
     for (int i = 0; i < VelmSoundDeviceInfoCount; ++i)
@@ -28,18 +18,11 @@ class AlsaNull : public ::testing::Test {
 protected:
     void SetUp() override
     {
-        VELMSOUND_Initialize();
-        VELMSOUND_UpdateDeviceList();
         device = VELMSOUND_GetSoundDeviceByName("null", 0);
         ASSERT_NE(device, nullptr);
     }
-    void TearDown() override
-    {
-        BLSETTINGS_DeleteEx(nullptr, "libvelm.sound.alsa.devices");
-        VELMSOUND_UpdateDeviceList();
-    }
 
-    Setting pcms{"libvelm.sound.alsa.devices", "null"};
+    Plugged pcms{"libvelm.sound.alsa.devices", "null"};
     VELMSOUNDDEVICE device = nullptr;
 };
 
@@ -88,15 +71,15 @@ TEST_F(AlsaNull, CaptureDeliversSilence)
 
 TEST_F(AlsaNull, AnUnknownPcmIsDroppedWithTheReason)
 {
-    Log log;
+    LogLines log(BLDEBUG_KIND_ERROR);
     Setting more{"libvelm.sound.alsa.devices", "null,velm_no_such_pcm"};
     VELMSOUND_UpdateDeviceList();
     EXPECT_EQ(VELMSOUND_GetSoundDeviceByName("velm_no_such_pcm", 0), nullptr);
     EXPECT_EQ(VELMSOUND_GetSoundDeviceByName("null", 0), device);
-    ASSERT_EQ(log.errors.size(), 2u);
-    EXPECT_EQ(log.errors[0], "VELMsound_windows_directsound::_PlaybackDeviceQueryCallback | Failed to probe playback "
+    ASSERT_EQ(log.lines.size(), 2u);
+    EXPECT_EQ(log.lines[0], "VELMsound_windows_directsound::_PlaybackDeviceQueryCallback | Failed to probe playback "
                              "device velm_no_such_pcm (NO SUCH DEVICE)");
-    EXPECT_EQ(log.errors[1], "VELMsound_windows_directsound::_CaptureDeviceQueryCallback | Failed to probe Capture "
+    EXPECT_EQ(log.lines[1], "VELMsound_windows_directsound::_CaptureDeviceQueryCallback | Failed to probe Capture "
                              "device velm_no_such_pcm (NO SUCH DEVICE)");
 }
 

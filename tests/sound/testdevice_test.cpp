@@ -12,15 +12,8 @@ class TestDevice : public ::testing::Test {
 protected:
     void SetUp() override
     {
-        VELMSOUND_Initialize();
-        VELMSOUND_UpdateDeviceList();
         device = VELMSOUND_GetSoundDeviceByName("Audio IO Test Device", 0);
         ASSERT_NE(device, nullptr);
-    }
-    void TearDown() override
-    {
-        BLSETTINGS_DeleteEx(nullptr, "libvelm.sound.testdevice");
-        VELMSOUND_UpdateDeviceList();
     }
 
     // Delivers this thread's timer ticks for a few rounds.
@@ -35,7 +28,7 @@ protected:
     velmtest::TempDir dir;
     std::string out_path = dir.file("test-played.wav");
     std::string in_path = dir.file("test-recorded.wav");
-    Setting enabled{"libvelm.sound.testdevice", "1"};
+    Plugged enabled{"libvelm.sound.testdevice", "1"};
     Setting out{"libvelm.sound.test.playbackfile", out_path};
     Setting in{"libvelm.sound.test.capturefile", in_path};
     VELMSOUNDDEVICE device = nullptr;
