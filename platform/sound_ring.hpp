@@ -13,7 +13,8 @@
 
 namespace velmsound {
 
-// Ring sizes in bytes for a buffer time, whole frames.
+// Ring sizes in bytes for a buffer time, whole frames; the capture ring
+// holds at most 20 seconds.
 uint32_t PlaybackRingBytes(const _audio_format *format, float buffer_time);
 uint32_t CaptureRingBytes(const _audio_format *format, float buffer_time);
 

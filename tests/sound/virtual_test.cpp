@@ -151,6 +151,8 @@ TEST_F(VirtualDevice, RefusesFormatsOtherThan16Bit)
     EXPECT_EQ(VELMSOUND_OpenPlayback(playback, 0.05f, nullptr, &source, &format), nullptr);
     EXPECT_EQ(VELMSOUND_OpenPlayback(nullptr, 0.05f, &ToneSource::Fill, &source, &format), nullptr);
     EXPECT_EQ(VELMSOUND_OpenPlayback(playback, 0.0f, &ToneSource::Fill, &source, &format), nullptr);
+    EXPECT_EQ(VELMSOUND_OpenPlayback(playback, 1e9f, &ToneSource::Fill, &source, &format), nullptr);
+    EXPECT_EQ(VELMSOUND_OpenCapture(capture, std::nanf(""), &ToneSource::Fill, &source, &format), nullptr);
 }
 
 class VirtualCapture : public VirtualDevice {
@@ -210,6 +212,20 @@ TEST_F(VirtualCapture, ARefusingConsumerEndsCapture)
     EXPECT_EQ(sink.calls.load(), 1);
     EXPECT_FALSE(VELMSOUND_Stop(stream));
     EXPECT_TRUE(VELMSOUND_Close(stream));
+}
+
+TEST_F(VirtualCapture, ALongBufferTimeStillCaptures)
+{
+    const std::vector<int16_t> tone = Tone(96000, 2, 0.1);
+    ASSERT_TRUE(WritePcm16(in_path, tone, 96000, 2));
+    CaptureSink sink;
+    const _audio_format format = Format(96000, 2);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenCapture(capture, 10.0f, &CaptureSink::Take, &sink, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(WaitFor([&] { return sink.Size() >= tone.size(); }));
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+    EXPECT_TRUE(std::equal(tone.begin(), tone.end(), sink.samples.begin()));
 }
 
 TEST_F(VirtualCapture, WithoutAFileDeliversSilenceAndCannotPause)
