@@ -4,6 +4,9 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <fstream>
+
 using namespace soundtest;
 
 namespace {
@@ -142,6 +145,24 @@ TEST_F(VirtualDevice, ClosingAPausedStreamReturns)
     EXPECT_TRUE(VELMSOUND_Close(stream));
 }
 
+TEST_F(VirtualDevice, PlaysOnWhenItsFileCannotBeWritten)
+{
+    const std::string nowhere = dir.file("missing/folder/played.wav");
+    Setting out_elsewhere{"libvelm.sound.virtual.playbackfile", nowhere};
+    LogLines errors(BLDEBUG_KIND_ERROR);
+    ToneSource source(Tone(8000, 1, 0.1));
+    const _audio_format format = Format(8000, 1);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(playback, 0.05f, &ToneSource::Fill, &source, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(WaitFor([&] { return !VELMSOUND_IsPlaying(stream); }));
+    EXPECT_GE(VELMSOUND_PlayCursorPosition(stream), 800);
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+    EXPECT_FALSE(std::filesystem::exists(nowhere));
+    ASSERT_EQ(errors.lines.size(), 1u);
+    EXPECT_NE(errors.lines[0].find(nowhere), std::string::npos);
+}
+
 TEST_F(VirtualDevice, RefusesFormatsOtherThan16Bit)
 {
     ToneSource source({});
@@ -226,6 +247,22 @@ TEST_F(VirtualCapture, ALongBufferTimeStillCaptures)
     ASSERT_TRUE(WaitFor([&] { return sink.Size() >= tone.size(); }));
     EXPECT_TRUE(VELMSOUND_Close(stream));
     EXPECT_TRUE(std::equal(tone.begin(), tone.end(), sink.samples.begin()));
+}
+
+TEST_F(VirtualCapture, AFileThatIsNoAudioGivesSilence)
+{
+    {
+        std::ofstream junk(in_path, std::ios::binary);
+        junk << "RIFF\x10\0\0\0WAVEfmt this is not audio at all";
+    }
+    CaptureSink sink;
+    const _audio_format format = Format(8000, 1);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenCapture(capture, 0.05f, &CaptureSink::Take, &sink, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(WaitFor([&] { return sink.Size() >= 800; }));
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+    EXPECT_TRUE(std::all_of(sink.samples.begin(), sink.samples.end(), [](int16_t s) { return s == 0; }));
 }
 
 TEST_F(VirtualCapture, WithoutAFileDeliversSilenceAndCannotPause)
