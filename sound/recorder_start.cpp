@@ -79,6 +79,7 @@ int VELMRECORD_Start(VELMRECORDER r, const char *undo_label)
     if (!r->pipe || !VELMSOUND_Start(r->stream)) {
         close_stream(r);
         velm::recorder_close_pipe(r);
+        if (undo_label) VELMAUDIO_Undo(r->doc);
         return 0;
     }
     if (r->updateCallback) r->timer = VELMTIMER_CreateTimer(velm::kRecordUpdateMs, r->updateCallback, r->updateUser);

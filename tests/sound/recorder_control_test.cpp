@@ -23,6 +23,9 @@ TEST_F(RecordControl, TheViewFollowsTheRecording)
     VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
     ASSERT_NE(r, nullptr);
     const VELMSTATE *state = VELMAUDIO_GetState(doc);
+    // A view shorter than ten seconds widens to ten at the start.
+    EXPECT_EQ(state->viewBegin, 0);
+    EXPECT_EQ(state->viewEnd, 10 * kRate);
     ASSERT_TRUE(pump_until([state] { return state->recordPosition > 200000 + 1000; }));
     EXPECT_EQ(state->recordStart, 200000);
     EXPECT_EQ(state->viewEnd, state->recordPosition);
@@ -112,6 +115,8 @@ TEST_F(RecordControl, AVetoedStopKeepsRecording)
         EXPECT_EQ(VELMAUDIO_RecordStop(doc), 0);
         EXPECT_EQ(refuse.count, 1);
         EXPECT_EQ(refuse.data1[0], static_cast<void *>(r));
+        // Nor can a new start replace it.
+        EXPECT_EQ(VELMAUDIO_RecordStart(doc, 0, nullptr), nullptr);
         // A format change that cannot stop the recording does not happen.
         _audio_format wider{kRate, 2, 16, 0, 0};
         EXPECT_EQ(VELMAUDIO_ChangeAudioFormat(doc, &wider, nullptr, nullptr, 0, 0, nullptr), 0);
