@@ -37,12 +37,6 @@ std::vector<VELMRECORDER> &live_recorders()
     return list;
 }
 
-bool is_live(VELMRECORDER recorder)
-{
-    const std::vector<VELMRECORDER> &list = live_recorders();
-    return std::find(list.begin(), list.end(), recorder) != list.end() && IsRegisteredObject(recorder);
-}
-
 int dispose_recorder(void *recorder)
 {
     return VELMRECORD_DestroyRecorder(static_cast<VELMRECORDER>(recorder));
@@ -60,6 +54,12 @@ void destroy_where(Match match)
 } // namespace
 
 namespace velm {
+
+bool recorder_alive(VELMRECORDER recorder)
+{
+    const std::vector<VELMRECORDER> &list = live_recorders();
+    return std::find(list.begin(), list.end(), recorder) != list.end() && IsRegisteredObject(recorder);
+}
 
 void end_document_recordings(VELMAUDIO doc)
 {
@@ -126,7 +126,7 @@ VELMRECORDER VELMRECORD_CreateRecorder(VELMAUDIO doc, uint32_t flags, int64_t po
 
 int VELMRECORD_DestroyRecorder(VELMRECORDER r)
 {
-    if (!r || !is_live(r)) return 0;
+    if (!r || !velm::recorder_alive(r)) return 0;
     if (r->timer) {
         VELMTIMER_KillTimer(r->timer);
         r->timer = nullptr;

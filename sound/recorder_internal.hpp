@@ -43,6 +43,8 @@ constexpr uint32_t kRecordUpdateMs = 500;
 
 // The stream callback: converts captured 16-bit samples and appends them.
 int32_t recorder_capture(void *user, void *data, int32_t bytes);
+// Whether recorder is still a live recorder.
+bool recorder_alive(VELMRECORDER recorder);
 // The default 500 ms update: the view follows the recording.
 int recorder_update(void *user);
 // Appends what the conversion still holds and starts it afresh; under the lock.

@@ -7,6 +7,7 @@
 
 namespace {
 
+// Reads the recorder before it sends anything: a handler may destroy it.
 int show_position(VELMRECORDER r, int64_t position)
 {
     VELMAUDIO doc = r->doc;
@@ -30,17 +31,14 @@ namespace velm {
 int recorder_update(void *user)
 {
     auto *r = static_cast<VELMRECORDER>(user);
-    if (!r || r->updateBusy) return 0;
+    if (!r || r->updateBusy || !VELMRECORD_IsRecording(r)) return 0;
+    const int64_t position = VELMRECORD_RecordPosition(r);
+    if (position <= r->lastShown) return 1;
+    r->lastShown = position;
     r->updateBusy = 1;
-    int result = 1;
-    if (VELMRECORD_IsRecording(r)) {
-        const int64_t position = VELMRECORD_RecordPosition(r);
-        if (position > r->lastShown) {
-            r->lastShown = position;
-            if (r->doc) result = show_position(r, position);
-        }
-    }
-    r->updateBusy = 0;
+    const int result = show_position(r, position);
+    // A handler of the events sent meanwhile may have destroyed the recorder.
+    if (recorder_alive(r)) r->updateBusy = 0;
     return result;
 }
 

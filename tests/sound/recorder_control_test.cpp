@@ -77,6 +77,25 @@ TEST_F(RecordControl, TheShellMayTakeOverTheTimer)
     EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 1);
 }
 
+// The shell may end the recording from the position event the timer sends.
+TEST_F(RecordControl, APositionHandlerMayStopTheRecording)
+{
+    for (uint32_t flags : {0u, VELMRECORD_FLAG_NOTIFY_POSITION}) {
+        VELMAUDIO doc = document(kRate, 1);
+        ASSERT_NE(doc, nullptr);
+        auto stop = [](const BLNotifyEvent *event, void *user) {
+            if (event->event == VELMRECORD_NOTIFY_POSITION && *static_cast<const int64_t *>(event->data1) > 0)
+                VELMAUDIO_RecordStop(static_cast<VELMAUDIO>(user));
+            return 1;
+        };
+        BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), stop, doc);
+        ASSERT_NE(VELMAUDIO_RecordStart(doc, flags, nullptr), nullptr);
+        EXPECT_TRUE(pump_until([doc] { return !VELMAUDIO_IsRecording(doc); })) << flags;
+        EXPECT_GT(VELMAUDIO_NumSamples(doc), 0) << flags;
+        pump();
+    }
+}
+
 TEST_F(RecordControl, AVetoedStartRecordsNothing)
 {
     VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 1000));
