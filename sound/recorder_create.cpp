@@ -127,6 +127,11 @@ VELMRECORDER VELMRECORD_CreateRecorder(VELMAUDIO doc, uint32_t flags, int64_t po
 int VELMRECORD_DestroyRecorder(VELMRECORDER r)
 {
     if (!r || !velm::recorder_alive(r)) return 0;
+    // Gone for everyone first: handlers of the events below cannot reach it twice.
+    UnRegisterObject(r);
+    std::vector<VELMRECORDER> &list = live_recorders();
+    list.erase(std::remove(list.begin(), list.end(), r), list.end());
+    VELMAUDIO_UnlinkRecorder(r->doc, r);
     if (r->timer) {
         VELMTIMER_KillTimer(r->timer);
         r->timer = nullptr;
@@ -137,10 +142,6 @@ int VELMRECORD_DestroyRecorder(VELMRECORDER r)
     if (was_recording) VELMAUDIO_SetStopRecordPosition(r->doc);
     if (!(r->flags & VELMRECORD_FLAG_SILENT_DESTROY))
         BLNOTIFY_SendEvent(VELMAUDIO_Dispatcher(r->doc), nullptr, 0, VELMRECORD_NOTIFY_DESTROYED, r, nullptr);
-    UnRegisterObject(r);
-    std::vector<VELMRECORDER> &list = live_recorders();
-    list.erase(std::remove(list.begin(), list.end(), r), list.end());
-    VELMAUDIO_UnlinkRecorder(r->doc, r);
     // Closing the stream ends its worker thread, which holds the record.
     if (r->stream && VELMSOUND_Close(r->stream)) r->status = VELMRECORD_STATUS_CLOSED;
     r->stream = nullptr;

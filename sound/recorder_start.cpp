@@ -32,10 +32,12 @@ VELMSOUNDSTREAM open_stream(VELMRECORDER r)
     return VELMSOUND_OpenCapture(r->device, r->bufferTime, velm::recorder_capture, r, &r->captureFormat);
 }
 
+// False when a handler refused, or destroyed the recorder meanwhile.
 bool announce(VELMRECORDER r, uint32_t event)
 {
     if (r->flags & VELMRECORD_FLAG_QUIET) return true;
-    return BLNOTIFY_SendEvent(VELMAUDIO_Dispatcher(r->doc), nullptr, 0, event, r, nullptr) != 0;
+    const bool agreed = BLNOTIFY_SendEvent(VELMAUDIO_Dispatcher(r->doc), nullptr, 0, event, r, nullptr) != 0;
+    return agreed && velm::recorder_alive(r);
 }
 
 } // namespace

@@ -241,6 +241,41 @@ TEST_F(RecordControl, ANewStartReplacesTheRunningRecorder)
     EXPECT_EQ(VELMAUDIO_RecordStop(doc), 0);
 }
 
+// Handlers that try to end a recorder while it is being ended, or while it
+// asks to start, find nothing left to end.
+TEST_F(RecordControl, HandlersCannotEndARecorderTwice)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    struct Attempts {
+        VELMAUDIO doc;
+        uint32_t code;
+        std::vector<int> results;
+    } attempts{doc, VELMRECORD_NOTIFY_DESTROYED, {}};
+    auto end_again = [](const BLNotifyEvent *event, void *user) {
+        auto *a = static_cast<Attempts *>(user);
+        if (event->event == a->code) {
+            a->results.push_back(VELMAUDIO_RecordStop(a->doc));
+            a->results.push_back(VELMRECORD_DestroyRecorder(static_cast<VELMRECORDER>(event->data1)));
+        }
+        return 1;
+    };
+    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), end_again, &attempts);
+    ASSERT_NE(VELMAUDIO_RecordStart(doc, 0, nullptr), nullptr);
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+    EXPECT_EQ(attempts.results, (std::vector<int>{0, 0}));
+
+    // Destroyed by a handler of its own start announcement: the start fails.
+    attempts.code = VELMRECORD_NOTIFY_START;
+    attempts.results.clear();
+    VELMRECORDER r = VELMRECORD_CreateRecorder(doc, 0, 0);
+    ASSERT_NE(r, nullptr);
+    EXPECT_EQ(VELMRECORD_Start(r, nullptr), 0);
+    EXPECT_EQ(attempts.results, (std::vector<int>{0, 1}));
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
+    BLNOTIFY_DelHandler(VELMAUDIO_Dispatcher(doc), end_again, &attempts);
+}
+
 TEST_F(RecordControl, ADocumentLinksOneRecorder)
 {
     VELMAUDIO doc = document(kRate, 1);
