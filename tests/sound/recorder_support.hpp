@@ -94,11 +94,11 @@ protected:
         return doc;
     }
 
-    // Delivers timer ticks until done() holds; false when it does not within
-    // a generous bound.
-    static bool pump_until(const std::function<bool()> &done)
+    // Delivers timer ticks every 2 ms until done() holds, at most rounds
+    // times (a generous bound); false when it never did.
+    static bool pump_until(const std::function<bool()> &done, int rounds = 5000)
     {
-        for (int i = 0; i < 5000; ++i) {
+        for (int i = 0; i < rounds; ++i) {
             VELMNATIVE_PumpTimers();
             if (done()) return true;
             std::this_thread::sleep_for(std::chrono::milliseconds(2));
@@ -106,14 +106,8 @@ protected:
         return false;
     }
 
-    // Lets the devices and timers run for a few dozen milliseconds.
-    static void pump(int rounds = 25)
-    {
-        for (int i = 0; i < rounds; ++i) {
-            VELMNATIVE_PumpTimers();
-            std::this_thread::sleep_for(std::chrono::milliseconds(2));
-        }
-    }
+    // Lets the devices and timers run for about fifty milliseconds.
+    static void pump() { pump_until([] { return false; }, 25); }
 
     static bool record_until(VELMRECORDER r, int64_t position)
     {
