@@ -83,6 +83,8 @@ int VELMRECORD_Initialize(void)
 
 void VELMRECORD_Finalize(void)
 {
+    // Their streams would outlive the devices they run on.
+    destroy_where([](VELMRECORDER) { return true; });
     VELMSOUND_Finalize();
 }
 

@@ -203,6 +203,22 @@ TEST_F(RecordControl, ClosingTheDocumentWhileRecordingEndsIt)
     pump(); // a capture thread still writing would touch freed memory here
 }
 
+TEST_F(RecordControl, FinalizingEndsEveryRecording)
+{
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(r, nullptr);
+    ASSERT_TRUE(record_until(r, 1000));
+    VELMRECORD_Finalize();
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
+    EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 0);
+    const int64_t length = VELMAUDIO_NumSamples(doc);
+    pump();
+    EXPECT_EQ(VELMAUDIO_NumSamples(doc), length);
+    VELMRECORD_Initialize();
+}
+
 TEST_F(RecordControl, UnloadingWhileRecordingKeepsWhatWasRecorded)
 {
     VELMAUDIO doc = document(kRate, 1, velmtest::sine(kRate, 1, 1000));
