@@ -40,7 +40,9 @@ typedef struct _VELMRECORDER *VELMRECORDER;
 #define VELMRECORD_NOTIFY_POSITION  0x20047 /* data 1: int64_t *position; data 2: the recorder
                                                when sent by its update timer, else null */
 
-/* Registers the recording settings and starts the sound layer. */
+/* Registers the recording settings ("libvelm.record.viewwindowtime", 30 s,
+ * and "libvelm.record.osbuffersize", the device latency, 0.05 s) and starts
+ * the sound layer.  Finalize frees every recorder, then stops the layer. */
 VELM_API int  VELMRECORD_Initialize(void);
 VELM_API void VELMRECORD_Finalize(void);
 
@@ -49,8 +51,11 @@ VELM_API void VELMRECORD_Finalize(void);
  * devices. */
 VELM_API VELMRECORDER VELMRECORD_CreateRecorder(VELMAUDIO doc, uint32_t flags, int64_t position);
 /* Opens the device named by "libvelm.record.devicename" and starts
- * capturing.  With a label an undo step of that label comes first. */
+ * capturing; 0 when a stream is already open (also after a stop), no device
+ * fits, or the start is vetoed.  With a label an undo step of that label
+ * comes first. */
 VELM_API int VELMRECORD_Start(VELMRECORDER recorder, const char *undo_label);
+/* Ends capturing (status stopped) unless vetoed; only while recording. */
 VELM_API int VELMRECORD_Stop(VELMRECORDER recorder);
 /* Stops a running capture without asking and frees the recorder; 0 for a
  * recorder that is not (or no longer) alive. */
@@ -76,8 +81,12 @@ VELM_API int VELMRECORD_Pause(VELMRECORDER recorder);
 VELM_API int VELMRECORD_Resume(VELMRECORDER recorder);
 VELM_API int VELMRECORD_IsPaused(VELMRECORDER recorder);
 
-/* The document's recorder: RecordStart replaces a running one and records
- * at the cursor; RecordStop stops and frees it. */
+/* The document's recorder.  RecordStart stops and frees a running one (null
+ * when that stop is vetoed), then records at the cursor; with
+ * VELMRECORD_FLAG_UNDO and a label an undo step comes first.  RecordStop
+ * stops and frees it (0 without one or when the stop is vetoed).  Closing or
+ * unloading the document, changing its format and replacing its signal
+ * (undo, revert) end the recording first. */
 VELM_API VELMRECORDER VELMAUDIO_RecordStart(VELMAUDIO doc, uint32_t flags, const char *undo_label);
 VELM_API int VELMAUDIO_RecordStop(VELMAUDIO doc);
 VELM_API int VELMAUDIO_IsRecording(VELMAUDIO doc);
