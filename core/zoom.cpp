@@ -243,7 +243,8 @@ int VELMAUDIO_ZoomVertical(VELMAUDIO doc, float a, float b)
     if (!loaded(doc)) return 0;
     float lo = std::max(std::min(a, b), -kVerticalBound);
     float hi = std::min(std::max(a, b), kVerticalBound);
-    if (lo == hi) return 0;
+    // Also refuses NaN and a range wholly outside the bounds, which would turn inside out.
+    if (!(lo < hi)) return 0;
     VELMSTATE *s = doc->state;
     if (lo == static_cast<float>(s->vertMin) && hi == static_cast<float>(s->vertMax)) return 1;
     if (!send(doc, 0x20018, &hi, &lo)) return 0;
@@ -290,7 +291,7 @@ int VELMAUDIO_ZoomSpectral(VELMAUDIO doc, float a, float b)
     float hi = std::min(std::max(a, b), nyquist(doc));
     VELMSTATE *s = doc->state;
     if (lo == static_cast<float>(s->spectralMin) && hi == static_cast<float>(s->spectralMax)) return 1;
-    if (hi - lo < kMinimumSpectralSpan) return 0;
+    if (!(hi - lo >= kMinimumSpectralSpan)) return 0; // NaN included
     if (!send(doc, 0x2001A, &lo, &hi)) return 0;
     doc->state->spectralMin = lo;
     doc->state->spectralMax = hi;

@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <limits>
 #include <string>
 #include <vector>
 
@@ -189,6 +190,27 @@ TEST_F(Doc, SpectralRange)
     EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMin, 250.0);
     EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMax, 750.0);
     EXPECT_FALSE(VELMAUDIO_ZoomSpectralFactorAround(doc, 5000, 0.5));
+}
+
+TEST_F(Doc, RangesThatAreNotNumbersOrOutsideTheBoundsAreRefused)
+{
+    VELMAUDIO_Close(doc);
+    make(44100, 44100);
+    const float nan = std::numeric_limits<float>::quiet_NaN();
+    const float inf = std::numeric_limits<float>::infinity();
+    EXPECT_FALSE(VELMAUDIO_ZoomVertical(doc, nan, 1.0f));
+    EXPECT_FALSE(VELMAUDIO_ZoomVertical(doc, -0.5f, nan));
+    EXPECT_FALSE(VELMAUDIO_ScrollVertical(doc, inf));
+    EXPECT_FALSE(VELMAUDIO_ZoomVertical(doc, 40000.0f, 50000.0f)); // wholly above the bounds
+    EXPECT_FALSE(VELMAUDIO_ZoomVerticalFactor(doc, std::numeric_limits<double>::quiet_NaN()));
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->vertMin, -1.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->vertMax, 1.0);
+    EXPECT_FALSE(VELMAUDIO_ZoomSpectral(doc, nan, 1000.0f));
+    EXPECT_FALSE(VELMAUDIO_ZoomSpectral(doc, 1000.0f, nan));
+    EXPECT_FALSE(VELMAUDIO_ZoomSpectralFactorAround(doc, nan, 0.5));
+    EXPECT_FALSE(VELMAUDIO_ScrollSpectral(doc, nan));
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMin, 0.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMax, 22050.0);
 }
 
 TEST_F(Doc, CursorClampsAndMarksItsChange)
