@@ -30,6 +30,12 @@ float nyquist(VELMAUDIO doc)
     return static_cast<float>(format.sampleRate) * 0.5f;
 }
 
+// A computed position as a sample, saturating where it leaves the 64-bit range.
+int64_t to_position(double value)
+{
+    return static_cast<int64_t>(std::clamp(std::trunc(value), -9.2e18, 9.2e18));
+}
+
 int send(VELMAUDIO doc, uint32_t code, void *data1, void *data2)
 {
     return BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, code, data1, data2);
@@ -126,11 +132,11 @@ int VELMAUDIO_ZoomOffset(VELMAUDIO doc, int64_t offset)
 
 void VELMAUDIO_ZoomByFactor(VELMAUDIO doc, int64_t centre, double factor)
 {
-    if (!loaded(doc)) return;
+    if (!loaded(doc) || !std::isfinite(factor)) return;
     const double begin = static_cast<double>(doc->state->viewBegin);
     const double end = static_cast<double>(doc->state->viewEnd);
-    const auto new_begin = static_cast<int64_t>(std::trunc(begin + (static_cast<double>(centre) - begin) * factor));
-    const auto new_end = static_cast<int64_t>(std::trunc(end - (end - static_cast<double>(centre)) * factor));
+    const int64_t new_begin = to_position(begin + (static_cast<double>(centre) - begin) * factor);
+    const int64_t new_end = to_position(end - (end - static_cast<double>(centre)) * factor);
     VELMAUDIO_Zoom(doc, new_begin, new_end);
 }
 

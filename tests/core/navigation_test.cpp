@@ -154,6 +154,19 @@ TEST_F(Doc, StepZoomAroundTheVisibleCursor)
     EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 896);
 }
 
+TEST_F(Doc, ZoomFactorsBeyondThePositionsSaturate)
+{
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 400, 600));
+    VELMAUDIO_ZoomByFactor(doc, 500, std::numeric_limits<double>::quiet_NaN());
+    VELMAUDIO_ZoomByFactor(doc, 500, std::numeric_limits<double>::infinity());
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 400);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 600);
+    // Growing the window by an absurd factor shows everything the limits allow.
+    VELMAUDIO_ZoomByFactor(doc, 500, -1e30);
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 0);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 1000);
+}
+
 TEST_F(Doc, VerticalRange)
 {
     ASSERT_TRUE(VELMAUDIO_ZoomVertical(doc, -0.5f, 1.0f));
