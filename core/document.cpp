@@ -296,18 +296,24 @@ int VELMAUDIO_Close(VELMAUDIO doc)
 static int release_reference(VELMAUDIO doc)
 {
     MutexLock(doc->referenceLock);
-    const int left = --doc->references;
+    // A close from a close-query handler only gives back a reference taken
+    // meanwhile; the close being asked decides alone.
+    const bool nested = doc->closeQuery;
+    if (!nested || doc->references > 0) --doc->references;
+    const int left = doc->references;
     MutexUnlock(doc->referenceLock);
-    if (left >= 1) return 0;
+    if (nested || left >= 1) return 0;
 
     if (doc->state->status & STATUS_MODIFIED) {
+        doc->closeQuery = 1;
         const int answer = BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x20009, doc, nullptr);
-        if (answer != 1) {
-            MutexLock(doc->referenceLock);
-            ++doc->references;
-            MutexUnlock(doc->referenceLock);
-            return 0;
-        }
+        doc->closeQuery = 0;
+        MutexLock(doc->referenceLock);
+        if (answer != 1) ++doc->references;
+        // A handler that took a reference keeps the document alive.
+        const bool kept = doc->references >= 1;
+        MutexUnlock(doc->referenceLock);
+        if (kept) return 0;
     }
     return velm::close_document(doc);
 }

@@ -37,6 +37,7 @@ struct _VELMAUDIO {
     VELMCUSTOMTRACK customTracks[VELM_MAX_CUSTOM_TRACKS];
     BLMUTEX      referenceLock;
     uint8_t      drawing;      // a draw is in progress
+    uint8_t      closeQuery;   // the last reference's close is being asked of the handlers
 };
 
 namespace velm {
