@@ -320,6 +320,18 @@ TEST_F(Doc, PositionTextsInEveryScaleKind)
     EXPECT_DOUBLE_EQ(VELMAUDIO_Duration(doc), 1.0);
 }
 
+TEST_F(Doc, ScalePositionsStopAtTheEndsOfTheRange)
+{
+    VELMAUDIO_SetDrawProperty(doc, 6, 100); // attaches a renderer; nothing laid out, so steps of 1
+    constexpr int64_t kMax = std::numeric_limits<int64_t>::max(), kMin = std::numeric_limits<int64_t>::min();
+    EXPECT_EQ(VELMAUDIO_GetNextPosition(doc, 10), 11);
+    EXPECT_EQ(VELMAUDIO_GetPrevPosition(doc, 10), 9);
+    EXPECT_EQ(VELMAUDIO_GetNextPosition(doc, kMax), kMax);
+    EXPECT_EQ(VELMAUDIO_GetNextTickPosition(doc, kMax - 1), kMax);
+    EXPECT_EQ(VELMAUDIO_GetPrevPosition(doc, kMin), kMin);
+    EXPECT_EQ(VELMAUDIO_GetPrevTickPosition(doc, kMin), kMin);
+}
+
 TEST(Navigation, WithoutASignalEverythingFails)
 {
     VELMAUDIO link = VELMAUDIO_CreateUnresolvedLink();
