@@ -132,6 +132,12 @@ int64_t VELMUTIL_TimeStringToSample(const char *text, int32_t rate)
 {
     int h = 0, m = 0, s = 0, ms = 0;
     if (!parse_copy(text, h, m, s, ms)) return 0;
-    const int64_t whole = (static_cast<int64_t>(h) * 3600 + static_cast<int64_t>(m) * 60 + s) * rate;
-    return whole + static_cast<int64_t>(static_cast<float>(ms) * static_cast<float>(rate) / 1000.0f);
+    const int64_t seconds = static_cast<int64_t>(h) * 3600 + static_cast<int64_t>(m) * 60 + s;
+    const auto fraction = static_cast<int64_t>(static_cast<float>(ms) * static_cast<float>(rate) / 1000.0f);
+    // Typed hours run to a billion: at absurd rates the sample saturates instead of wrapping.
+    int64_t whole, total;
+    if (__builtin_mul_overflow(seconds, int64_t{rate}, &whole))
+        return (seconds < 0) != (rate < 0) ? INT64_MIN : INT64_MAX;
+    if (__builtin_add_overflow(whole, fraction, &total)) return fraction < 0 ? INT64_MIN : INT64_MAX;
+    return total;
 }
