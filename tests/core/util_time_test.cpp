@@ -112,6 +112,18 @@ TEST(UtilTime, HugeTimesAtHugeRatesSaturate)
     EXPECT_EQ(VELMUTIL_TimeStringToSample("999999999:00:00", 48000), int64_t(999999999) * 3600 * 48000);
 }
 
+TEST(UtilTime, TheLongestPositionsNeverTurnNegative)
+{
+    constexpr int64_t kMax = std::numeric_limits<int64_t>::max();
+    char buffer[64];
+    ASSERT_TRUE(VELMUTIL_SamplesToTimeString(kMax, kMax, 1, buffer, sizeof buffer));
+    EXPECT_EQ(std::string(buffer).find('-'), std::string::npos) << buffer;
+    EXPECT_EQ(ms_text(kMax, kMax).find('-'), std::string::npos) << ms_text(kMax, kMax);
+    int h = 0;
+    VELMUTIL_DecomposeMsTime(kMax, &h, nullptr, nullptr, nullptr);
+    EXPECT_EQ(h, std::numeric_limits<int>::max());
+}
+
 TEST(UtilTime, DecomposeMsTimeTruncates)
 {
     int h, m, s, ms;
