@@ -81,7 +81,8 @@ int VELMAUDIO_Zoom(VELMAUDIO doc, int64_t a, int64_t b)
     int64_t lo = std::max(std::min(a, b), VELMAUDIO_ViewBeginLimit(doc));
     int64_t hi = std::min(std::max(a, b), VELMAUDIO_ViewEndLimit(doc));
     if (lo == hi) return 0;
-    if (hi - lo < kMinimumWindow || (lo == doc->state->viewBegin && hi == doc->state->viewEnd)) return 1;
+    // hi < lo first: a request wholly outside the limits must not be subtracted.
+    if (hi < lo || hi - lo < kMinimumWindow || (lo == doc->state->viewBegin && hi == doc->state->viewEnd)) return 1;
     if (!send(doc, 0x20014, &lo, &hi)) return 0;
     if (lo == hi) return 0;
     doc->state->viewBegin = lo;

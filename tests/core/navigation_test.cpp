@@ -126,6 +126,20 @@ TEST_F(Doc, ZoomLimitsBoundTheWindow)
     EXPECT_FALSE(VELMAUDIO_ChangeControlVisibility(doc, 1, 1));
 }
 
+TEST_F(Doc, ExtremeWindowRequestsWithinLimits)
+{
+    constexpr int64_t kMax = std::numeric_limits<int64_t>::max(), kMin = std::numeric_limits<int64_t>::min();
+    ASSERT_TRUE(VELMAUDIO_SetZoomLimits(doc, 300, 700));
+    EXPECT_TRUE(VELMAUDIO_Zoom(doc, kMin, kMin)); // wholly below the limits: nothing to show, nothing changes
+    EXPECT_TRUE(VELMAUDIO_Zoom(doc, kMax, kMax));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 300);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 700);
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 400, 500));
+    EXPECT_TRUE(VELMAUDIO_Zoom(doc, kMin, kMax));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 300);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 700);
+}
+
 TEST_F(Doc, CentringOnTheCursorKeepsTheLength)
 {
     ASSERT_TRUE(VELMAUDIO_Zoom(doc, 0, 200));
