@@ -202,9 +202,12 @@ int VELMAUDIO_SetZoomLimits(VELMAUDIO doc, int64_t a, int64_t b)
         hi = std::max(a, b);
     }
     if (!send(doc, 0x20016, &lo, &hi)) return 0;
+    const int64_t lower_limit = lo < 0 ? 0 : lo, upper_limit = std::min(hi, sample_count(doc));
+    // Limits that leave no part of the signal would lock the window for good.
+    if (upper_limit >= 0 && lower_limit >= upper_limit) return 0;
     VELMSTATE *s = doc->state;
-    s->zoomLowerLimit = lo < 0 ? 0 : lo;
-    s->zoomUpperLimit = std::min(hi, sample_count(doc));
+    s->zoomLowerLimit = lower_limit;
+    s->zoomUpperLimit = upper_limit;
     const int zoomed = VELMAUDIO_Zoom(doc, s->zoomLowerLimit, s->zoomUpperLimit);
     VELMSTATE_NotifyChanges(doc, 0);
     int64_t lower = doc->state->zoomLowerLimit, upper = doc->state->zoomUpperLimit;

@@ -126,6 +126,18 @@ TEST_F(Doc, ZoomLimitsBoundTheWindow)
     EXPECT_FALSE(VELMAUDIO_ChangeControlVisibility(doc, 1, 1));
 }
 
+TEST_F(Doc, LimitsLeavingNoWindowAreRefused)
+{
+    EXPECT_FALSE(VELMAUDIO_SetZoomLimits(doc, 2000, 3000)); // wholly past the end
+    EXPECT_FALSE(VELMAUDIO_SetZoomLimits(doc, 500, 0));
+    EXPECT_EQ(VELMAUDIO_ViewBeginLimit(doc), 0);
+    EXPECT_EQ(VELMAUDIO_ViewEndLimit(doc), 1000);
+    EXPECT_FALSE(VELMAUDIO_HasZoomLimit(doc));
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 100, 200));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 100);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 200);
+}
+
 TEST_F(Doc, ExtremeWindowRequestsWithinLimits)
 {
     constexpr int64_t kMax = std::numeric_limits<int64_t>::max(), kMin = std::numeric_limits<int64_t>::min();
