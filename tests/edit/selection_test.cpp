@@ -162,6 +162,17 @@ TEST_F(Sel, DraggingCommitsByKind)
     EXPECT_EQ(list(), (List{{4000, 6000}}));
 }
 
+TEST_F(Sel, DragsOutsideTheSignalStayInsideIt)
+{
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, 20000, 30000)); // wholly past the end
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.begin, 10.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.end, 10.0);
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, -50, -10)); // wholly before the start
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.begin, 0.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.end, 0.0);
+    EXPECT_EQ(VELMAUDIO_GetCursorPosition(doc), 0);
+}
+
 TEST_F(Sel, DurationsOfAbsurdRecordsSaturate)
 {
     constexpr int64_t kMax = std::numeric_limits<int64_t>::max();
