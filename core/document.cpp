@@ -379,7 +379,8 @@ int VELMAUDIO_SaveCopyAs(VELMAUDIO doc, const char *file_name, const char *forma
 
 int VELMAUDIO_RevertToSaved(VELMAUDIO doc)
 {
-    if (!doc || !doc->signal || !(doc->state->status & STATUS_HAS_FILE)) return 0;
+    // A draw holds the signal's read access and is drawing it: it stays until the draw ends.
+    if (!doc || !doc->signal || doc->drawing || !(doc->state->status & STATUS_HAS_FILE)) return 0;
     AUDIOSIGNAL *fresh = AUDIOSIGNAL_OpenEx(doc->fileName, doc->fileFormat, 3, doc, velm::signal_callback);
     if (!fresh) return 0;
     AUDIOSIGNAL *old = VELMAUDIO_SetAudioSignal(doc, fresh);
