@@ -315,6 +315,11 @@ static int release_reference(VELMAUDIO doc)
         MutexUnlock(doc->referenceLock);
         if (kept) return 0;
     }
+    // Closed from a handler of a draw: the draw is still using the document.
+    if (doc->drawing) {
+        doc->closeAfterDraw = 1;
+        return 1;
+    }
     return velm::close_document(doc);
 }
 

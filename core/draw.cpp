@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "core/document_internal.hpp"
+#include "core/startup_internal.hpp"
 #include "core/velmconfig.h"
 #include "render/view/velmdraw.h"
 
@@ -21,6 +22,7 @@ public:
         VELMAUDIO_DeactivateSettings(doc_);
         doc_->drawing = 0;
         AUDIOSIGNAL_ReleaseReadAccess(doc_->signal);
+        if (doc_->closeAfterDraw) velm::close_document(doc_);
     }
     DrawSession(const DrawSession &) = delete;
     DrawSession &operator=(const DrawSession &) = delete;
@@ -58,7 +60,7 @@ int VELMAUDIO_Draw(VELMCANVAS canvas, VELMAUDIO doc, _VELMRECT *changed)
         if (changed) std::memset(changed, 0, sizeof *changed);
         return 1;
     }
-    if (!BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x2001E, nullptr, nullptr)) return 0;
+    if (!BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x2001E, nullptr, nullptr) || doc->closeAfterDraw) return 0;
     const int result = VELMDRAW_UpdateDraw(doc->renderer, canvas, doc->state, changed);
     if (result) VELMSTATE_ResetVisualChanges(doc);
     BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x2001F, nullptr, nullptr);

@@ -51,3 +51,19 @@ TEST(DocumentDraw, TheSignalStaysWhileItIsDrawn)
     EXPECT_FALSE(VELMAUDIO_HasChanges(doc));
     VELMAUDIO_Close(doc);
 }
+
+TEST(DocumentDraw, AClosedDocumentGoesOnceTheDrawEnds)
+{
+    velmtest::TempDir dir;
+    const std::string path = dir.file("speech.wav");
+    ASSERT_TRUE(velmtest::write_audio(path, viewtest::speech_like(kRate, 1, 1.0), kRate, 1));
+    VELMAUDIO doc = VELMAUDIO_Open(path.c_str(), "AUTO");
+    ASSERT_NE(doc, nullptr);
+    const int before_count = CountRegisteredObjects();
+    BeforeDraw before{doc, VELMAUDIO_Close};
+    VELMAUDIO_AddEventHandler(doc, BeforeDraw::handler, &before);
+    viewtest::Canvas canvas(400, 200);
+    EXPECT_FALSE(canvas.draw(doc)); // nothing is drawn for a document on its way out
+    EXPECT_EQ(before.result, 1);
+    EXPECT_EQ(CountRegisteredObjects(), before_count - 1);
+}
