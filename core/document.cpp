@@ -14,14 +14,17 @@
 #include "edit/velmundo.h"
 #include "outside/signal/audiosignal.h"
 
+static int release_reference(VELMAUDIO doc);
+
 namespace {
 
 int untitled_counter = 1;
 
-// The object registry disposes of documents still open at shut-down.
+// The object registry disposes of documents still open at shut-down, having
+// already forgotten them.
 int dispose_document(void *doc)
 {
-    return VELMAUDIO_Close(static_cast<VELMAUDIO>(doc));
+    return release_reference(static_cast<VELMAUDIO>(doc));
 }
 
 VELMAUDIO create_record()
@@ -344,7 +347,8 @@ static int unload(VELMAUDIO doc)
 
 int VELMAUDIO_CloseEx(VELMAUDIO doc, int mode)
 {
-    if (!doc) return 0;
+    // A live document is registered until its teardown: a stale handle is refused unread.
+    if (!doc || !IsRegisteredObject(doc)) return 0;
     if (mode == 0) return release_reference(doc);
     if (mode == 1) return unload(doc);
     return 0;

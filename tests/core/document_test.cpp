@@ -270,6 +270,16 @@ TEST(DocumentClose, ReferencesAndTheCloseQuery)
     EXPECT_TRUE(VELMAUDIO_Close(doc));
 }
 
+TEST(DocumentClose, ASecondCloseOfAClosedDocumentFails)
+{
+    const _audio_format f = mono8k();
+    VELMAUDIO doc = VELMAUDIO_New(&f);
+    ASSERT_NE(doc, nullptr);
+    EXPECT_TRUE(VELMAUDIO_Close(doc));
+    EXPECT_FALSE(VELMAUDIO_Close(doc));
+    EXPECT_FALSE(VELMAUDIO_CloseEx(doc, 1));
+}
+
 TEST(DocumentClose, CloseOrReferenceFromTheCloseQuery)
 {
     // A handler that closes the document again while it is asked, then agrees:
