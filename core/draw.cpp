@@ -12,7 +12,8 @@ namespace {
 // The signal's read access and the drawing mark for the length of one draw.
 class DrawSession {
 public:
-    explicit DrawSession(VELMAUDIO doc) : doc_(doc), held_(AUDIOSIGNAL_TryReadAccess(doc->signal) != 0)
+    explicit DrawSession(VELMAUDIO doc)
+        : doc_(doc), signal_(doc->signal), held_(AUDIOSIGNAL_TryReadAccess(signal_) != 0)
     {
         if (held_) doc_->drawing = 1;
     }
@@ -21,7 +22,8 @@ public:
         if (!held_) return;
         VELMAUDIO_DeactivateSettings(doc_);
         doc_->drawing = 0;
-        AUDIOSIGNAL_ReleaseReadAccess(doc_->signal);
+        // The one taken: a handler may have given the document another signal meanwhile.
+        AUDIOSIGNAL_ReleaseReadAccess(signal_);
         if (doc_->closeAfterDraw) velm::close_document(doc_);
     }
     DrawSession(const DrawSession &) = delete;
@@ -30,6 +32,7 @@ public:
 
 private:
     VELMAUDIO doc_;
+    AUDIOSIGNAL *signal_;
     bool held_;
 };
 

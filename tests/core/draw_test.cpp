@@ -67,3 +67,26 @@ TEST(DocumentDraw, AClosedDocumentGoesOnceTheDrawEnds)
     EXPECT_EQ(before.result, 1);
     EXPECT_EQ(CountRegisteredObjects(), before_count - 1);
 }
+
+TEST(DocumentDraw, TheDrawLetsGoOfTheSignalItTook)
+{
+    velmtest::TempDir dir;
+    const std::string path = dir.file("speech.wav");
+    ASSERT_TRUE(velmtest::write_audio(path, viewtest::speech_like(kRate, 1, 1.0), kRate, 1));
+    VELMAUDIO doc = VELMAUDIO_Open(path.c_str(), "AUTO");
+    ASSERT_NE(doc, nullptr);
+    AUDIOSIGNAL *taken = VELMAUDIO_GetAudioSignal(doc);
+    static AUDIOSIGNAL *replacement = nullptr;
+    replacement = AUDIOSIGNAL_DuplicateEx(taken, 0);
+    ASSERT_NE(replacement, nullptr);
+    // The handler swaps the document's signal while the draw holds the first one.
+    BeforeDraw before{doc, [](VELMAUDIO d) { return VELMAUDIO_SetAudioSignal(d, replacement) ? 1 : 0; }};
+    VELMAUDIO_AddEventHandler(doc, BeforeDraw::handler, &before);
+    viewtest::Canvas canvas(400, 200);
+    canvas.draw(doc);
+    ASSERT_EQ(before.result, 1);
+    EXPECT_FALSE(AUDIOSIGNAL_ReleaseReadAccess(taken)); // nothing left held
+    EXPECT_FALSE(AUDIOSIGNAL_ReleaseReadAccess(replacement));
+    AUDIOSIGNAL_Destroy(taken);
+    VELMAUDIO_Close(doc);
+}
