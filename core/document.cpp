@@ -284,7 +284,8 @@ int VELMAUDIO_CanOpen(const char *file_name, const char *format, int flags)
 
 VELMAUDIO VELMAUDIO_Reference(VELMAUDIO doc)
 {
-    if (!doc) return nullptr;
+    // Neither a stale handle nor a document closed while it draws can be held again.
+    if (!doc || !IsRegisteredObject(doc) || doc->closeAfterDraw) return nullptr;
     MutexLock(doc->referenceLock);
     ++doc->references;
     MutexUnlock(doc->referenceLock);

@@ -270,7 +270,7 @@ TEST(DocumentClose, ReferencesAndTheCloseQuery)
     EXPECT_TRUE(VELMAUDIO_Close(doc));
 }
 
-TEST(DocumentClose, ASecondCloseOfAClosedDocumentFails)
+TEST(DocumentClose, AClosedDocumentCannotBeClosedOrReferencedAgain)
 {
     const _audio_format f = mono8k();
     VELMAUDIO doc = VELMAUDIO_New(&f);
@@ -278,6 +278,7 @@ TEST(DocumentClose, ASecondCloseOfAClosedDocumentFails)
     EXPECT_TRUE(VELMAUDIO_Close(doc));
     EXPECT_FALSE(VELMAUDIO_Close(doc));
     EXPECT_FALSE(VELMAUDIO_CloseEx(doc, 1));
+    EXPECT_EQ(VELMAUDIO_Reference(doc), nullptr);
 }
 
 TEST(DocumentClose, CloseOrReferenceFromTheCloseQuery)

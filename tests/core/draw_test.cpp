@@ -65,7 +65,8 @@ TEST_F(BeforeDraw, TheSignalStaysWhileItIsDrawn)
 TEST_F(BeforeDraw, AClosedDocumentGoesOnceTheDrawEnds)
 {
     const int registered = CountRegisteredObjects();
-    action = VELMAUDIO_Close;
+    // Once closed it can no longer be referenced, though the draw still holds it.
+    action = [](VELMAUDIO d) { return VELMAUDIO_Close(d) && !VELMAUDIO_Reference(d) ? 1 : 0; };
     EXPECT_FALSE(canvas.draw(doc)); // nothing is drawn for a document on its way out
     EXPECT_EQ(result, 1);
     EXPECT_EQ(CountRegisteredObjects(), registered - 1);
