@@ -15,14 +15,17 @@
 #include "outside/signal/audiosignal.h"
 #include "sound/recorder_guard.hpp"
 
+static int release_reference(VELMAUDIO doc);
+
 namespace {
 
 int untitled_counter = 1;
 
-// The object registry disposes of documents still open at shut-down.
+// The object registry disposes of documents still open at shut-down, having
+// already forgotten them.
 int dispose_document(void *doc)
 {
-    return VELMAUDIO_Close(static_cast<VELMAUDIO>(doc));
+    return release_reference(static_cast<VELMAUDIO>(doc));
 }
 
 VELMAUDIO create_record()
@@ -282,7 +285,8 @@ int VELMAUDIO_CanOpen(const char *file_name, const char *format, int flags)
 
 VELMAUDIO VELMAUDIO_Reference(VELMAUDIO doc)
 {
-    if (!doc) return nullptr;
+    // Neither a stale handle nor a document closed while it draws can be held again.
+    if (!doc || !IsRegisteredObject(doc) || doc->closeAfterDraw) return nullptr;
     MutexLock(doc->referenceLock);
     ++doc->references;
     MutexUnlock(doc->referenceLock);
@@ -297,20 +301,31 @@ int VELMAUDIO_Close(VELMAUDIO doc)
 static int release_reference(VELMAUDIO doc)
 {
     MutexLock(doc->referenceLock);
-    const int left = --doc->references;
+    // A close from a close-query handler only gives back a reference taken
+    // meanwhile; the close being asked decides alone.
+    const bool nested = doc->closeQuery;
+    if (!nested || doc->references > 0) --doc->references;
+    const int left = doc->references;
     MutexUnlock(doc->referenceLock);
-    if (left >= 1) return 0;
+    if (nested || left >= 1) return 0;
 
     // Stopped first, so that what was recorded counts as a change below.
     velm::end_document_recordings(doc);
     if (doc->state->status & STATUS_MODIFIED) {
+        doc->closeQuery = 1;
         const int answer = BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x20009, doc, nullptr);
-        if (answer != 1) {
-            MutexLock(doc->referenceLock);
-            ++doc->references;
-            MutexUnlock(doc->referenceLock);
-            return 0;
-        }
+        doc->closeQuery = 0;
+        MutexLock(doc->referenceLock);
+        if (answer != 1) ++doc->references;
+        // A handler that took a reference keeps the document alive.
+        const bool kept = doc->references >= 1;
+        MutexUnlock(doc->referenceLock);
+        if (kept) return 0;
+    }
+    // Closed from a handler of a draw: the draw is still using the document.
+    if (doc->drawing) {
+        doc->closeAfterDraw = 1;
+        return 1;
     }
     return velm::close_document(doc);
 }
@@ -337,7 +352,8 @@ static int unload(VELMAUDIO doc)
 
 int VELMAUDIO_CloseEx(VELMAUDIO doc, int mode)
 {
-    if (!doc) return 0;
+    // A live document is registered until its teardown: a stale handle is refused unread.
+    if (!doc || !IsRegisteredObject(doc)) return 0;
     if (mode == 0) return release_reference(doc);
     if (mode == 1) return unload(doc);
     return 0;
@@ -377,7 +393,8 @@ int VELMAUDIO_SaveCopyAs(VELMAUDIO doc, const char *file_name, const char *forma
 
 int VELMAUDIO_RevertToSaved(VELMAUDIO doc)
 {
-    if (!doc || !doc->signal || !(doc->state->status & STATUS_HAS_FILE)) return 0;
+    // A draw holds the signal's read access and is drawing it: it stays until the draw ends.
+    if (!doc || !doc->signal || doc->drawing || !(doc->state->status & STATUS_HAS_FILE)) return 0;
     AUDIOSIGNAL *fresh = AUDIOSIGNAL_OpenEx(doc->fileName, doc->fileFormat, 3, doc, velm::signal_callback);
     if (!fresh) return 0;
     AUDIOSIGNAL *old = VELMAUDIO_SetAudioSignal(doc, fresh);

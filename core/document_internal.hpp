@@ -37,6 +37,8 @@ struct _VELMAUDIO {
     VELMCUSTOMTRACK customTracks[VELM_MAX_CUSTOM_TRACKS];
     BLMUTEX      referenceLock;
     uint8_t      drawing;      // a draw is in progress
+    uint8_t      closeQuery;   // the last reference's close is being asked of the handlers
+    uint8_t      closeAfterDraw; // closed from a handler while drawing: torn down when the draw ends
 };
 
 namespace velm {

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "core/document_internal.hpp"
+#include "core/startup_internal.hpp"
 #include "core/velmconfig.h"
 #include "render/view/velmdraw.h"
 
@@ -11,7 +12,8 @@ namespace {
 // The signal's read access and the drawing mark for the length of one draw.
 class DrawSession {
 public:
-    explicit DrawSession(VELMAUDIO doc) : doc_(doc), held_(AUDIOSIGNAL_TryReadAccess(doc->signal) != 0)
+    explicit DrawSession(VELMAUDIO doc)
+        : doc_(doc), signal_(doc->signal), held_(AUDIOSIGNAL_TryReadAccess(signal_) != 0)
     {
         if (held_) doc_->drawing = 1;
     }
@@ -20,7 +22,9 @@ public:
         if (!held_) return;
         VELMAUDIO_DeactivateSettings(doc_);
         doc_->drawing = 0;
-        AUDIOSIGNAL_ReleaseReadAccess(doc_->signal);
+        // The one taken: a handler may have given the document another signal meanwhile.
+        AUDIOSIGNAL_ReleaseReadAccess(signal_);
+        if (doc_->closeAfterDraw) velm::close_document(doc_);
     }
     DrawSession(const DrawSession &) = delete;
     DrawSession &operator=(const DrawSession &) = delete;
@@ -28,6 +32,7 @@ public:
 
 private:
     VELMAUDIO doc_;
+    AUDIOSIGNAL *signal_;
     bool held_;
 };
 
@@ -58,7 +63,7 @@ int VELMAUDIO_Draw(VELMCANVAS canvas, VELMAUDIO doc, _VELMRECT *changed)
         if (changed) std::memset(changed, 0, sizeof *changed);
         return 1;
     }
-    if (!BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x2001E, nullptr, nullptr)) return 0;
+    if (!BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x2001E, nullptr, nullptr) || doc->closeAfterDraw) return 0;
     const int result = VELMDRAW_UpdateDraw(doc->renderer, canvas, doc->state, changed);
     if (result) VELMSTATE_ResetVisualChanges(doc);
     BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x2001F, nullptr, nullptr);

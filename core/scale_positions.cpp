@@ -1,6 +1,7 @@
 // Positions along the horizontal scale: a tenth of its step for fine moves,
 // two steps for tick moves.
 #include <algorithm>
+#include <cstdint>
 
 #include "core/document_internal.hpp"
 #include "core/velmnavigation.h"
@@ -13,14 +14,17 @@ int64_t scale_step(VELMAUDIO doc)
     return VELMDRAW_GetHorzScaleStep(doc->renderer);
 }
 
+// Both stay on the last multiple the 64-bit positions hold instead of wrapping.
 int64_t next_multiple(int64_t p, int64_t s)
 {
+    if (p > INT64_MAX - s) return INT64_MAX - INT64_MAX % s;
     return (p + s) - ((p + s) % s);
 }
 
 int64_t previous_multiple(int64_t p, int64_t s)
 {
-    return p % s != 0 ? p - (p % s) : p - s;
+    if (p % s != 0) return p - (p % s);
+    return p < INT64_MIN + s ? p : p - s;
 }
 
 bool ready(VELMAUDIO doc)

@@ -61,8 +61,10 @@ int64_t VELMSTATE_SelectionSize(VELMAUDIO doc, const VELMSTATE *state)
 {
     if (!state) return 0;
     int64_t total = 0;
-    for (const VELMSELECTION *s = state->selections; s; s = s->next)
-        total += VELMSELECTION_GetEnd(doc, s) - VELMSELECTION_GetBegin(doc, s);
+    for (const VELMSELECTION *s = state->selections; s; s = s->next) {
+        const int64_t duration = VELMSELECTION_GetDuration(doc, s);
+        if (__builtin_add_overflow(total, duration, &total)) return duration > 0 ? INT64_MAX : INT64_MIN;
+    }
     return total;
 }
 

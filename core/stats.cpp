@@ -1,5 +1,6 @@
 // Statistics, sums and extremes over a document's selections or its whole signal.
 #include <cmath>
+#include <cstdint>
 #include <limits>
 
 #include "core/document_internal.hpp"
@@ -13,8 +14,8 @@ int actual_channel(VELMAUDIO doc, int channel)
 {
     const uint32_t mask = AUDIOSIGNAL_GetActiveChannelMask(doc->signal);
     if (mask == 0 || channel < 0) return -1;
-    const int c = __builtin_ctz(mask) + channel;
-    return c < AUDIOSIGNAL_NumChannels(doc->signal) ? c : -1;
+    const int first = __builtin_ctz(mask);
+    return channel < AUDIOSIGNAL_NumChannels(doc->signal) - first ? first + channel : -1;
 }
 
 // Calls f(begin, count) for each selection, or once for the whole signal.
@@ -47,9 +48,12 @@ double channel_sum(VELMAUDIO doc, int channel, Sum sum)
 int VELMAUDIO_GetSignalStats(VELMAUDIO doc, AUDIOSIGNAL_STATISTICS *out, double window, uint8_t flag)
 {
     if (!doc || !doc->signal) return 0;
+    // The window travels in whole milliseconds in 32 bits.
+    const double window_ms = std::trunc(window * 1000.0);
+    if (!(window_ms >= INT32_MIN && window_ms <= INT32_MAX)) return 0;
     AUDIOSIGNAL_STATSACC total = AUDIOSIGNAL_CalculateStatStart(doc->signal);
     AUDIOSIGNAL_STATSRANGE range{};
-    range.window = static_cast<int32_t>(std::trunc(window * 1000.0));
+    range.window = static_cast<int32_t>(window_ms);
     range.active_only = flag;
     bool first = true;
     for_each_range(doc, [&](int64_t begin, int64_t count) {

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstdint>
 
 namespace {
 
@@ -17,6 +18,12 @@ int32_t to_pixel(double value)
 {
     if (!std::isfinite(value)) return 0;
     return static_cast<int32_t>(std::clamp(std::trunc(value), -2147483648.0, 2147483647.0));
+}
+
+// Edges and sizes of rectangles near the ends of the 32-bit range stay at those ends.
+int32_t saturated(int64_t value)
+{
+    return static_cast<int32_t>(std::clamp<int64_t>(value, INT32_MIN, INT32_MAX));
 }
 
 } // namespace
@@ -39,8 +46,8 @@ int VELMUTIL_IsOverRectBorder(const _VELMRECT *r, int mask, int x, int y)
 {
     if (!VELMUTIL_IsInsideRect(r, x, y)) return 0;
     const int64_t right = int64_t{r->left} + r->width, bottom = int64_t{r->top} + r->height;
-    if ((mask & VELMUTIL_BORDER_LEFT) && r->left - 1 <= x && x <= int64_t{r->left} + 2) return 1;
-    if ((mask & VELMUTIL_BORDER_TOP) && r->top - 1 <= y && y <= int64_t{r->top} + 2) return 1;
+    if ((mask & VELMUTIL_BORDER_LEFT) && int64_t{r->left} - 1 <= x && x <= int64_t{r->left} + 2) return 1;
+    if ((mask & VELMUTIL_BORDER_TOP) && int64_t{r->top} - 1 <= y && y <= int64_t{r->top} + 2) return 1;
     if ((mask & VELMUTIL_BORDER_RIGHT) && right - 2 <= x && x <= right + 1) return 1;
     if ((mask & VELMUTIL_BORDER_BOTTOM) && bottom - 2 <= y && y <= bottom + 1) return 1;
     return 0;
@@ -62,16 +69,16 @@ int VELMUTIL_EvalDimensions(_VELMRECT *r, int mode)
     if (!r) return 0;
     switch (mode) {
     case 2:
-        r->width = r->right + 1 - r->left;
-        r->height = r->bottom + 1 - r->top;
+        r->width = saturated(int64_t{r->right} + 1 - r->left);
+        r->height = saturated(int64_t{r->bottom} + 1 - r->top);
         return r->width > 0 && r->height > 0;
     case 4:
-        r->right = r->left + r->width - 1;
-        r->bottom = r->top + r->height - 1;
+        r->right = saturated(int64_t{r->left} + r->width - 1);
+        r->bottom = saturated(int64_t{r->top} + r->height - 1);
         return 1;
     case 1:
-        r->left = r->right + 1 - r->width;
-        r->top = r->bottom + 1 - r->height;
+        r->left = saturated(int64_t{r->right} + 1 - r->width);
+        r->top = saturated(int64_t{r->bottom} + 1 - r->height);
         return 1;
     default:
         return 0;

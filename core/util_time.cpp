@@ -1,7 +1,9 @@
 // Millisecond and sample texts, and the parser of typed times.
 #include "core/velmutil.h"
 
+#include <algorithm>
 #include <cinttypes>
+#include <climits>
 #include <cstdarg>
 #include <cstdint>
 #include <cmath>
@@ -37,9 +39,11 @@ int leading_number(const char *text)
     return static_cast<int>(negative ? -value : value);
 }
 
+// Below 1000 Hz the milliseconds of the longest positions leave 64 bits: saturate.
 int64_t samples_to_ms(int64_t sample, int32_t rate)
 {
-    return static_cast<int64_t>(std::trunc(static_cast<double>(sample) / (rate / 1000.0) + 0.5));
+    const double ms = std::trunc(static_cast<double>(sample) / (rate / 1000.0) + 0.5);
+    return static_cast<int64_t>(std::clamp(ms, -9.2e18, 9.2e18));
 }
 
 } // namespace
@@ -50,7 +54,7 @@ void VELMUTIL_DecomposeMsTime(int64_t ms, int *hours, int *minutes, int *seconds
     if (milliseconds) *milliseconds = static_cast<int>(ms % 1000);
     if (seconds) *seconds = static_cast<int>(s % 60);
     if (minutes) *minutes = static_cast<int>((s / 60) % 60);
-    if (hours) *hours = static_cast<int>(s / 3600);
+    if (hours) *hours = static_cast<int>(std::clamp<int64_t>(s / 3600, INT_MIN, INT_MAX));
 }
 
 int VELMUTIL_MsTimeToBuffer(int64_t ms, int64_t reference_ms, char *buffer, int size)
@@ -132,6 +136,12 @@ int64_t VELMUTIL_TimeStringToSample(const char *text, int32_t rate)
 {
     int h = 0, m = 0, s = 0, ms = 0;
     if (!parse_copy(text, h, m, s, ms)) return 0;
-    const int64_t whole = (static_cast<int64_t>(h) * 3600 + static_cast<int64_t>(m) * 60 + s) * rate;
-    return whole + static_cast<int64_t>(static_cast<float>(ms) * static_cast<float>(rate) / 1000.0f);
+    const int64_t seconds = static_cast<int64_t>(h) * 3600 + static_cast<int64_t>(m) * 60 + s;
+    const auto fraction = static_cast<int64_t>(static_cast<float>(ms) * static_cast<float>(rate) / 1000.0f);
+    // Typed hours run to a billion: at absurd rates the sample saturates instead of wrapping.
+    int64_t whole, total;
+    if (__builtin_mul_overflow(seconds, int64_t{rate}, &whole))
+        return (seconds < 0) != (rate < 0) ? INT64_MIN : INT64_MAX;
+    if (__builtin_add_overflow(whole, fraction, &total)) return fraction < 0 ? INT64_MIN : INT64_MAX;
+    return total;
 }

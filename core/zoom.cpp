@@ -30,6 +30,12 @@ float nyquist(VELMAUDIO doc)
     return static_cast<float>(format.sampleRate) * 0.5f;
 }
 
+// A computed position as a sample, saturating where it leaves the 64-bit range.
+int64_t to_position(double value)
+{
+    return static_cast<int64_t>(std::clamp(std::trunc(value), -9.2e18, 9.2e18));
+}
+
 int send(VELMAUDIO doc, uint32_t code, void *data1, void *data2)
 {
     return BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, code, data1, data2);
@@ -75,7 +81,8 @@ int VELMAUDIO_Zoom(VELMAUDIO doc, int64_t a, int64_t b)
     int64_t lo = std::max(std::min(a, b), VELMAUDIO_ViewBeginLimit(doc));
     int64_t hi = std::min(std::max(a, b), VELMAUDIO_ViewEndLimit(doc));
     if (lo == hi) return 0;
-    if (hi - lo < kMinimumWindow || (lo == doc->state->viewBegin && hi == doc->state->viewEnd)) return 1;
+    // hi < lo first: a request wholly outside the limits must not be subtracted.
+    if (hi < lo || hi - lo < kMinimumWindow || (lo == doc->state->viewBegin && hi == doc->state->viewEnd)) return 1;
     if (!send(doc, 0x20014, &lo, &hi)) return 0;
     if (lo == hi) return 0;
     doc->state->viewBegin = lo;
@@ -126,11 +133,11 @@ int VELMAUDIO_ZoomOffset(VELMAUDIO doc, int64_t offset)
 
 void VELMAUDIO_ZoomByFactor(VELMAUDIO doc, int64_t centre, double factor)
 {
-    if (!loaded(doc)) return;
+    if (!loaded(doc) || !std::isfinite(factor)) return;
     const double begin = static_cast<double>(doc->state->viewBegin);
     const double end = static_cast<double>(doc->state->viewEnd);
-    const auto new_begin = static_cast<int64_t>(std::trunc(begin + (static_cast<double>(centre) - begin) * factor));
-    const auto new_end = static_cast<int64_t>(std::trunc(end - (end - static_cast<double>(centre)) * factor));
+    const int64_t new_begin = to_position(begin + (static_cast<double>(centre) - begin) * factor);
+    const int64_t new_end = to_position(end - (end - static_cast<double>(centre)) * factor);
     VELMAUDIO_Zoom(doc, new_begin, new_end);
 }
 
@@ -195,9 +202,12 @@ int VELMAUDIO_SetZoomLimits(VELMAUDIO doc, int64_t a, int64_t b)
         hi = std::max(a, b);
     }
     if (!send(doc, 0x20016, &lo, &hi)) return 0;
+    const int64_t lower_limit = lo < 0 ? 0 : lo, upper_limit = std::min(hi, sample_count(doc));
+    // Limits that leave no part of the signal would lock the window for good.
+    if (upper_limit >= 0 && lower_limit >= upper_limit) return 0;
     VELMSTATE *s = doc->state;
-    s->zoomLowerLimit = lo < 0 ? 0 : lo;
-    s->zoomUpperLimit = std::min(hi, sample_count(doc));
+    s->zoomLowerLimit = lower_limit;
+    s->zoomUpperLimit = upper_limit;
     const int zoomed = VELMAUDIO_Zoom(doc, s->zoomLowerLimit, s->zoomUpperLimit);
     VELMSTATE_NotifyChanges(doc, 0);
     int64_t lower = doc->state->zoomLowerLimit, upper = doc->state->zoomUpperLimit;
@@ -243,7 +253,8 @@ int VELMAUDIO_ZoomVertical(VELMAUDIO doc, float a, float b)
     if (!loaded(doc)) return 0;
     float lo = std::max(std::min(a, b), -kVerticalBound);
     float hi = std::min(std::max(a, b), kVerticalBound);
-    if (lo == hi) return 0;
+    // Also refuses NaN and a range wholly outside the bounds, which would turn inside out.
+    if (!(lo < hi)) return 0;
     VELMSTATE *s = doc->state;
     if (lo == static_cast<float>(s->vertMin) && hi == static_cast<float>(s->vertMax)) return 1;
     if (!send(doc, 0x20018, &hi, &lo)) return 0;
@@ -290,7 +301,7 @@ int VELMAUDIO_ZoomSpectral(VELMAUDIO doc, float a, float b)
     float hi = std::min(std::max(a, b), nyquist(doc));
     VELMSTATE *s = doc->state;
     if (lo == static_cast<float>(s->spectralMin) && hi == static_cast<float>(s->spectralMax)) return 1;
-    if (hi - lo < kMinimumSpectralSpan) return 0;
+    if (!(hi - lo >= kMinimumSpectralSpan)) return 0; // NaN included
     if (!send(doc, 0x2001A, &lo, &hi)) return 0;
     doc->state->spectralMin = lo;
     doc->state->spectralMax = hi;

@@ -212,7 +212,9 @@ int VELMAUDIO_UpdateSelecting(VELMAUDIO doc, int64_t a, int64_t b)
 {
     if (!loaded(doc)) return 0;
     const int64_t count = sample_count(doc);
-    int64_t lo = std::max<int64_t>(0, std::min(a, b)), hi = std::min(count, std::max(a, b));
+    // Both ends are clamped into the signal, so a drag wholly outside it collapses
+    // at the nearer end instead of turning inside out.
+    int64_t lo = std::clamp<int64_t>(std::min(a, b), 0, count), hi = std::clamp<int64_t>(std::max(a, b), 0, count);
     VELMSTATE *s = doc->state;
     VELMSELECTION_SetBegin(doc, &s->selecting, lo);
     VELMSELECTION_SetEnd(doc, &s->selecting, hi);

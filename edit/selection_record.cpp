@@ -1,6 +1,8 @@
 // Selection records.
 #include "edit/velmselection.h"
 
+#include <cstdint>
+
 #include "core/velmtimeconv.h"
 
 VELMSELECTION *VELMSELECTION_CreateAudioSelection(BLMEM pool, double begin, double end)
@@ -26,7 +28,12 @@ int64_t VELMSELECTION_GetEnd(VELMAUDIO doc, const VELMSELECTION *s)
 
 int64_t VELMSELECTION_GetDuration(VELMAUDIO doc, const VELMSELECTION *s)
 {
-    return s ? VELMSELECTION_GetEnd(doc, s) - VELMSELECTION_GetBegin(doc, s) : 0;
+    if (!s) return 0;
+    // Times beyond the positions convert to the extremes; their distance saturates.
+    int64_t duration;
+    if (__builtin_sub_overflow(VELMSELECTION_GetEnd(doc, s), VELMSELECTION_GetBegin(doc, s), &duration))
+        return s->end > s->begin ? INT64_MAX : INT64_MIN;
+    return duration;
 }
 
 double VELMSELECTION_GetBeginTime(const VELMSELECTION *s)

@@ -270,6 +270,57 @@ TEST(DocumentClose, ReferencesAndTheCloseQuery)
     EXPECT_TRUE(VELMAUDIO_Close(doc));
 }
 
+TEST(DocumentClose, AClosedDocumentCannotBeClosedOrReferencedAgain)
+{
+    const _audio_format f = mono8k();
+    VELMAUDIO doc = VELMAUDIO_New(&f);
+    ASSERT_NE(doc, nullptr);
+    EXPECT_TRUE(VELMAUDIO_Close(doc));
+    EXPECT_FALSE(VELMAUDIO_Close(doc));
+    EXPECT_FALSE(VELMAUDIO_CloseEx(doc, 1));
+    EXPECT_EQ(VELMAUDIO_Reference(doc), nullptr);
+}
+
+TEST(DocumentClose, CloseOrReferenceFromTheCloseQuery)
+{
+    // A handler that closes the document again while it is asked, then agrees:
+    // the document goes exactly once.
+    struct Reentrant {
+        VELMAUDIO doc;
+        int nested = -1;
+        bool reference = false;
+        static int handler(const BLNotifyEvent *event, void *user)
+        {
+            auto *self = static_cast<Reentrant *>(user);
+            if (event->event != 0x20009) return 1;
+            if (self->reference)
+                VELMAUDIO_Reference(self->doc);
+            else
+                self->nested = VELMAUDIO_Close(self->doc);
+            return 1;
+        }
+    };
+    const _audio_format f = mono8k();
+    Reentrant closing{VELMAUDIO_New(&f)};
+    modify(closing.doc);
+    VELMAUDIO_AddEventHandler(closing.doc, Reentrant::handler, &closing);
+    EXPECT_TRUE(VELMAUDIO_Close(closing.doc));
+    EXPECT_EQ(closing.nested, 0);
+
+    // A handler that takes a reference while asked keeps the document alive.
+    Reentrant keeping{VELMAUDIO_New(&f)};
+    keeping.reference = true;
+    modify(keeping.doc);
+    VELMAUDIO_AddEventHandler(keeping.doc, Reentrant::handler, &keeping);
+    EXPECT_FALSE(VELMAUDIO_Close(keeping.doc));
+    EXPECT_TRUE(VELMAUDIO_IsOpen(keeping.doc));
+    keeping.reference = false;
+    VELMAUDIO_DelEventHandler(keeping.doc, Reentrant::handler, &keeping);
+    EventLog agree;
+    VELMAUDIO_AddEventHandler(keeping.doc, EventLog::handler, &agree);
+    EXPECT_TRUE(VELMAUDIO_Close(keeping.doc));
+}
+
 TEST(DocumentOptions, OptionTexts)
 {
     EXPECT_EQ(VELMDEFINES_DecodeVelmOptions(0, "editable"), OPTION_EDITABLE);

@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <limits>
 #include <string>
 #include <vector>
 
@@ -125,6 +126,32 @@ TEST_F(Doc, ZoomLimitsBoundTheWindow)
     EXPECT_FALSE(VELMAUDIO_ChangeControlVisibility(doc, 1, 1));
 }
 
+TEST_F(Doc, LimitsLeavingNoWindowAreRefused)
+{
+    EXPECT_FALSE(VELMAUDIO_SetZoomLimits(doc, 2000, 3000)); // wholly past the end
+    EXPECT_FALSE(VELMAUDIO_SetZoomLimits(doc, 500, 0));
+    EXPECT_EQ(VELMAUDIO_ViewBeginLimit(doc), 0);
+    EXPECT_EQ(VELMAUDIO_ViewEndLimit(doc), 1000);
+    EXPECT_FALSE(VELMAUDIO_HasZoomLimit(doc));
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 100, 200));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 100);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 200);
+}
+
+TEST_F(Doc, ExtremeWindowRequestsWithinLimits)
+{
+    constexpr int64_t kMax = std::numeric_limits<int64_t>::max(), kMin = std::numeric_limits<int64_t>::min();
+    ASSERT_TRUE(VELMAUDIO_SetZoomLimits(doc, 300, 700));
+    EXPECT_TRUE(VELMAUDIO_Zoom(doc, kMin, kMin)); // wholly below the limits: nothing to show, nothing changes
+    EXPECT_TRUE(VELMAUDIO_Zoom(doc, kMax, kMax));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 300);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 700);
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 400, 500));
+    EXPECT_TRUE(VELMAUDIO_Zoom(doc, kMin, kMax));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 300);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 700);
+}
+
 TEST_F(Doc, CentringOnTheCursorKeepsTheLength)
 {
     ASSERT_TRUE(VELMAUDIO_Zoom(doc, 0, 200));
@@ -151,6 +178,19 @@ TEST_F(Doc, StepZoomAroundTheVisibleCursor)
     ASSERT_TRUE(VELMAUDIO_ZoomIn(doc));
     EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 104);
     EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 896);
+}
+
+TEST_F(Doc, ZoomFactorsBeyondThePositionsSaturate)
+{
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 400, 600));
+    VELMAUDIO_ZoomByFactor(doc, 500, std::numeric_limits<double>::quiet_NaN());
+    VELMAUDIO_ZoomByFactor(doc, 500, std::numeric_limits<double>::infinity());
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 400);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 600);
+    // Growing the window by an absurd factor shows everything the limits allow.
+    VELMAUDIO_ZoomByFactor(doc, 500, -1e30);
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 0);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 1000);
 }
 
 TEST_F(Doc, VerticalRange)
@@ -189,6 +229,27 @@ TEST_F(Doc, SpectralRange)
     EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMin, 250.0);
     EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMax, 750.0);
     EXPECT_FALSE(VELMAUDIO_ZoomSpectralFactorAround(doc, 5000, 0.5));
+}
+
+TEST_F(Doc, RangesThatAreNotNumbersOrOutsideTheBoundsAreRefused)
+{
+    VELMAUDIO_Close(doc);
+    make(44100, 44100);
+    const float nan = std::numeric_limits<float>::quiet_NaN();
+    const float inf = std::numeric_limits<float>::infinity();
+    EXPECT_FALSE(VELMAUDIO_ZoomVertical(doc, nan, 1.0f));
+    EXPECT_FALSE(VELMAUDIO_ZoomVertical(doc, -0.5f, nan));
+    EXPECT_FALSE(VELMAUDIO_ScrollVertical(doc, inf));
+    EXPECT_FALSE(VELMAUDIO_ZoomVertical(doc, 40000.0f, 50000.0f)); // wholly above the bounds
+    EXPECT_FALSE(VELMAUDIO_ZoomVerticalFactor(doc, std::numeric_limits<double>::quiet_NaN()));
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->vertMin, -1.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->vertMax, 1.0);
+    EXPECT_FALSE(VELMAUDIO_ZoomSpectral(doc, nan, 1000.0f));
+    EXPECT_FALSE(VELMAUDIO_ZoomSpectral(doc, 1000.0f, nan));
+    EXPECT_FALSE(VELMAUDIO_ZoomSpectralFactorAround(doc, nan, 0.5));
+    EXPECT_FALSE(VELMAUDIO_ScrollSpectral(doc, nan));
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMin, 0.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->spectralMax, 22050.0);
 }
 
 TEST_F(Doc, CursorClampsAndMarksItsChange)
@@ -283,6 +344,18 @@ TEST_F(Doc, PositionTextsInEveryScaleKind)
     EXPECT_EQ(VELMAUDIO_TimeToFrameSample(doc, 1.0), 0);
     EXPECT_EQ(VELMAUDIO_ScaleFrameLength(doc), 882);
     EXPECT_DOUBLE_EQ(VELMAUDIO_Duration(doc), 1.0);
+}
+
+TEST_F(Doc, ScalePositionsStopAtTheEndsOfTheRange)
+{
+    VELMAUDIO_SetDrawProperty(doc, 6, 100); // attaches a renderer; nothing laid out, so steps of 1
+    constexpr int64_t kMax = std::numeric_limits<int64_t>::max(), kMin = std::numeric_limits<int64_t>::min();
+    EXPECT_EQ(VELMAUDIO_GetNextPosition(doc, 10), 11);
+    EXPECT_EQ(VELMAUDIO_GetPrevPosition(doc, 10), 9);
+    EXPECT_EQ(VELMAUDIO_GetNextPosition(doc, kMax), kMax);
+    EXPECT_EQ(VELMAUDIO_GetNextTickPosition(doc, kMax - 1), kMax);
+    EXPECT_EQ(VELMAUDIO_GetPrevPosition(doc, kMin), kMin);
+    EXPECT_EQ(VELMAUDIO_GetPrevTickPosition(doc, kMin), kMin);
 }
 
 TEST(Navigation, WithoutASignalEverythingFails)

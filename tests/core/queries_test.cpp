@@ -10,6 +10,7 @@
 #include <chrono>
 #include <filesystem>
 #include <fstream>
+#include <limits>
 #include <thread>
 
 namespace {
@@ -143,6 +144,21 @@ TEST_F(Opened, StatisticsOverSelectionsMergeTheirParts)
     EXPECT_NEAR(parts.channel[1].mean, (sum(1, 0, 800) + sum(1, 2000, 4000)) / 2800, 1e-4);
     EXPECT_TRUE(VELMAUDIO_GetSignalStats(doc, nullptr, 0.05, 0));
     EXPECT_FALSE(VELMAUDIO_GetSignalStats(nullptr, &parts, 0.05, 0));
+}
+
+TEST_F(Opened, AbsurdChannelsAndWindowsAreRefused)
+{
+    AUDIOSIGNAL_DisableChannel(VELMAUDIO_GetAudioSignal(doc), 0);
+    float lo = 0, hi = 0;
+    EXPECT_FALSE(VELMAUDIO_GetChannelMinMax(doc, std::numeric_limits<int>::max(), &lo, &hi));
+    EXPECT_EQ(VELMAUDIO_GetChannelSamplesSum(doc, std::numeric_limits<int>::max()), 0.0);
+    EXPECT_EQ(VELMAUDIO_GetChannelSamplesSum2(doc, -1), 0.0);
+
+    AUDIOSIGNAL_STATISTICS stats{};
+    EXPECT_FALSE(VELMAUDIO_GetSignalStats(doc, &stats, std::numeric_limits<double>::quiet_NaN(), 0));
+    EXPECT_FALSE(VELMAUDIO_GetSignalStats(doc, &stats, std::numeric_limits<double>::infinity(), 0));
+    EXPECT_FALSE(VELMAUDIO_GetSignalStats(doc, &stats, 1e10, 0)); // milliseconds beyond 32 bits
+    EXPECT_TRUE(VELMAUDIO_GetSignalStats(doc, &stats, 0.05, 0));
 }
 
 TEST_F(Opened, MetadataIsCreatedOnDemandAndSaved)

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <limits>
 
 TEST(UtilRect, DefineComposeAndCompare)
 {
@@ -57,6 +58,31 @@ TEST(UtilRect, EvalDimensionsModes)
     EXPECT_EQ(r.left, 41);
     EXPECT_FALSE(VELMUTIL_EvalDimensions(&r, 3));
     EXPECT_FALSE(VELMUTIL_EvalDimensions(nullptr, 2));
+}
+
+TEST(UtilRect, EdgesOfHugeRectanglesSaturate)
+{
+    constexpr int kMax = std::numeric_limits<int>::max(), kMin = std::numeric_limits<int>::min();
+    _VELMRECT r;
+    VELMUTIL_DefineRect(&r, 10, -10, kMax, kMax);
+    EXPECT_EQ(r.right, kMax);
+    EXPECT_EQ(r.bottom, kMax - 11);
+    r = _VELMRECT{kMin, 0, 0, 0, kMax, 5};
+    EXPECT_TRUE(VELMUTIL_EvalDimensions(&r, 2));
+    EXPECT_EQ(r.width, kMax);
+    EXPECT_EQ(r.height, 6);
+    r = _VELMRECT{0, 0, kMax, 2, kMin, 1};
+    EXPECT_TRUE(VELMUTIL_EvalDimensions(&r, 1));
+    EXPECT_EQ(r.left, kMin);
+    EXPECT_EQ(r.top, 0);
+    _VELMRECT a, b, c;
+    VELMUTIL_DefineRect(&a, kMin, 0, 1, 1);
+    VELMUTIL_DefineRect(&b, kMax - 1, 0, 1, 1);
+    VELMUTIL_ComposeRect(&c, &a, &b);
+    EXPECT_EQ(c.width, kMax);
+    VELMUTIL_DefineRect(&r, kMin, kMin, 10, 10);
+    EXPECT_TRUE(VELMUTIL_IsOverRectBorder(&r, VELMUTIL_BORDER_LEFT, kMin, kMin + 5));
+    EXPECT_TRUE(VELMUTIL_IsOverRectBorder(&r, VELMUTIL_BORDER_TOP, kMin + 5, kMin));
 }
 
 namespace {

@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
+#include <limits>
 #include <string>
 
 namespace {
@@ -100,6 +102,26 @@ TEST(UtilTime, TextToMillisecondsAndSamples)
     EXPECT_EQ(VELMUTIL_TimeStringToSample("0:01.5", 8000), 12000);
     EXPECT_EQ(VELMUTIL_TimeStringToSample("1:00:00", 192000), int64_t(3600) * 192000);
     EXPECT_EQ(VELMUTIL_TimeStringToMs(nullptr), 0);
+}
+
+TEST(UtilTime, HugeTimesAtHugeRatesSaturate)
+{
+    constexpr int32_t kRate = std::numeric_limits<int32_t>::max();
+    EXPECT_EQ(VELMUTIL_TimeStringToSample("999999999:00:00", kRate), std::numeric_limits<int64_t>::max());
+    EXPECT_EQ(VELMUTIL_TimeStringToSample("-999999999:00:00", kRate), std::numeric_limits<int64_t>::min());
+    EXPECT_EQ(VELMUTIL_TimeStringToSample("999999999:00:00", 48000), int64_t(999999999) * 3600 * 48000);
+}
+
+TEST(UtilTime, TheLongestPositionsNeverTurnNegative)
+{
+    constexpr int64_t kMax = std::numeric_limits<int64_t>::max();
+    char buffer[64];
+    ASSERT_TRUE(VELMUTIL_SamplesToTimeString(kMax, kMax, 1, buffer, sizeof buffer));
+    EXPECT_EQ(std::string(buffer).find('-'), std::string::npos) << buffer;
+    EXPECT_EQ(ms_text(kMax, kMax).find('-'), std::string::npos) << ms_text(kMax, kMax);
+    int h = 0;
+    VELMUTIL_DecomposeMsTime(kMax, &h, nullptr, nullptr, nullptr);
+    EXPECT_EQ(h, std::numeric_limits<int>::max());
 }
 
 TEST(UtilTime, DecomposeMsTimeTruncates)

@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdint>
+#include <limits>
 #include <utility>
 #include <vector>
 
@@ -159,6 +160,32 @@ TEST_F(Sel, DraggingCommitsByKind)
     ASSERT_TRUE(VELMAUDIO_UndoSelecting(doc));
     EXPECT_EQ(VELMAUDIO_GetState(doc)->selectingKind, SELECTING_REPLACE);
     EXPECT_EQ(list(), (List{{4000, 6000}}));
+}
+
+TEST_F(Sel, DragsOutsideTheSignalStayInsideIt)
+{
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, 20000, 30000)); // wholly past the end
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.begin, 10.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.end, 10.0);
+    ASSERT_TRUE(VELMAUDIO_UpdateSelecting(doc, -50, -10)); // wholly before the start
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.begin, 0.0);
+    EXPECT_DOUBLE_EQ(VELMAUDIO_GetState(doc)->selecting.end, 0.0);
+    EXPECT_EQ(VELMAUDIO_GetCursorPosition(doc), 0);
+}
+
+TEST_F(Sel, DurationsOfAbsurdRecordsSaturate)
+{
+    constexpr int64_t kMax = std::numeric_limits<int64_t>::max();
+    VELMSELECTION wide{-1e300, 1e300, nullptr};
+    EXPECT_EQ(VELMSELECTION_GetDuration(doc, &wide), kMax);
+    VELMSELECTION twice{0.0, 1e300, nullptr};
+    VELMSELECTION first{-1e300, 0.0, &twice};
+    VELMSTATE *state = VELMSTATE_Create();
+    ASSERT_NE(state, nullptr);
+    state->selections = &first;
+    EXPECT_EQ(VELMSTATE_SelectionSize(doc, state), kMax);
+    state->selections = nullptr;
+    VELMSTATE_Destroy(state);
 }
 
 TEST(SelectionRecord, CompareAndNulls)
