@@ -13,6 +13,7 @@
 #include "edit/velmregion.h"
 #include "edit/velmundo.h"
 #include "outside/signal/audiosignal.h"
+#include "sound/player_internal.hpp"
 
 namespace {
 
@@ -141,6 +142,9 @@ void copy_text(char *buffer, size_t size, const char *text)
 int close_document(VELMAUDIO doc)
 {
     UnRegisterObject(doc);
+    // No player may read the document once it is gone; a closing document
+    // takes its players with it, unasked.
+    play::destroy_players_of(doc);
     if (doc->dispatcher) {
         BLNOTIFY_DestroyDispatcher(doc->dispatcher);
         doc->dispatcher = nullptr;
@@ -300,9 +304,12 @@ static int release_reference(VELMAUDIO doc)
     MutexUnlock(doc->referenceLock);
     if (left >= 1) return 0;
 
+    // The question whether to close a modified document is asked in silence.
+    const bool paused = VELMAUDIO_GetPlayStatus(doc) == VELMPLAY_STATUS_PLAYING && VELMAUDIO_PlayPause(doc);
     if (doc->state->status & STATUS_MODIFIED) {
         const int answer = BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x20009, doc, nullptr);
         if (answer != 1) {
+            if (paused) VELMAUDIO_PlayResume(doc);
             MutexLock(doc->referenceLock);
             ++doc->references;
             MutexUnlock(doc->referenceLock);
@@ -316,6 +323,7 @@ static int unload(VELMAUDIO doc)
 {
     VELMSTATE *state = doc->state;
     if (!(state->status & STATUS_HAS_FILE) || (state->status & STATUS_MODIFIED) || doc->drawing) return 0;
+    velm::play::destroy_players_of(doc);
     VELMDRAW_Destroy(doc->renderer);
     doc->renderer = nullptr;
     if (doc->signal) AUDIOSIGNAL_Destroy(VELMAUDIO_SetAudioSignal(doc, nullptr));
@@ -398,7 +406,7 @@ AUDIOSIGNAL *VELMAUDIO_SetAudioSignal(VELMAUDIO doc, AUDIOSIGNAL *signal)
     if (!doc) return nullptr;
     AUDIOSIGNAL *previous = doc->signal;
     if (previous) AUDIOSIGNAL_SetParentObject(previous, nullptr, nullptr);
-    doc->signal = signal;
+    velm::play::replace_signal(doc, signal);
     if (signal) AUDIOSIGNAL_SetParentObject(signal, doc, velm::signal_callback);
     return previous;
 }

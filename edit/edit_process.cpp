@@ -8,6 +8,7 @@
 #include "core/velmqueries.h"
 #include "core/velmtimeconv.h"
 #include "edit/edit_internal.hpp"
+#include "sound/velmplay.h"
 
 namespace {
 
@@ -151,6 +152,9 @@ int VELMAUDIO_ChangeAudioFormat(VELMAUDIO doc, const _audio_format *format, cons
     if (n < 0 || static_cast<size_t>(n) >= effect.size()) return 0;
     effect.resize(static_cast<size_t>(n));
 
+    // A player reads in the old format: it stops first, and a refused stop
+    // leaves the format as it is.
+    if (VELMAUDIO_Player(doc) && !VELMAUDIO_PlayStop(doc)) return 0;
     if (!VELMAUDIO_Transform(doc, effect.c_str(), label ? label : "Change Audio Format")) return 0;
     if (wanted.sampleRate == current.sampleRate) return 1;
     VELMAUDIO_SetCursorPosition(doc, VELMAUDIO_TimeToSample(doc, cursor));
