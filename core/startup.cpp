@@ -6,6 +6,7 @@
 #include "core/velmconfig.h"
 #include "outside/signal/audioformat.h"
 #include "outside/signal/dspb.h"
+#include "sound/velmsound.h"
 
 namespace {
 
@@ -28,6 +29,7 @@ void stop_services()
     AUDIO_Finalize();
     DSPB_Finalize();
     BLCORE_Finalize();
+    VELMSOUND_Finalize();
 }
 
 } // namespace
