@@ -2,6 +2,7 @@
 #ifndef VELM_PLAYER_INTERNAL_HPP
 #define VELM_PLAYER_INTERNAL_HPP
 
+#include <array>
 #include <cstdint>
 #include <mutex>
 #include <utility>
@@ -17,7 +18,6 @@
 namespace velm::play {
 
 constexpr int kGainChannels = AUDIO_GAIN_CHANNELS;
-constexpr int64_t kNoMark = INT64_MAX;
 constexpr int64_t kEmptyRangeBegin = 0x07FFFFFFFFFFFFFFLL;
 
 // One stage of the audio path: the source, the effect or the conversion.
@@ -53,6 +53,44 @@ struct DocumentView {
     int64_t limitBegin = 0, limitEnd = 0;
     std::vector<std::pair<int64_t, int64_t>> chunks; // the selections, ascending
     int64_t cursorMove = -1;  // where the user put the cursor, not yet followed
+};
+
+// Where the sound heard takes a new course: from `frames` delivered on, the
+// position is basePosition + (frames - baseFrames) x speed.  The reader
+// queues one at each jump or speed change; the position takes them in
+// order as the device gets there.
+struct JumpMark {
+    int64_t frames;
+    int64_t basePosition;
+    int64_t baseFrames;
+    float speed;
+};
+
+// Jumps read but not yet heard.  A full queue merges the newest into the
+// last mark, so the display then moves a little early rather than wrong.
+class JumpMarks {
+public:
+    void clear() { count_ = first_ = 0; }
+    bool empty() const { return count_ == 0; }
+    const JumpMark &front() const { return marks_[first_]; }
+    void pop()
+    {
+        first_ = (first_ + 1) % marks_.size();
+        --count_;
+    }
+    void push(const JumpMark &mark)
+    {
+        if (count_ == marks_.size()) {
+            JumpMark &newest = marks_[(first_ + count_ - 1) % marks_.size()];
+            newest = JumpMark{newest.frames, mark.basePosition, mark.baseFrames, mark.speed};
+            return;
+        }
+        marks_[(first_ + count_++) % marks_.size()] = mark;
+    }
+
+private:
+    std::array<JumpMark, 64> marks_{};
+    size_t first_ = 0, count_ = 0;
 };
 
 using FillFunction = int64_t (*)(struct Player *, float *destination, int64_t frames);
@@ -94,7 +132,7 @@ struct Player {
     bool playingRegion = false;
     int64_t regionBegin = 0, regionEnd = 0;
     int64_t framesDelivered = 0;
-    int64_t jumpMark = kNoMark;
+    JumpMarks jumpMarks;
     int64_t baseFrames = 0;
     int64_t framesAtChange = 0;
     float displaySpeed = 1.0f, currentSpeed = 1.0f, requestedSpeed = 1.0f;

@@ -36,11 +36,12 @@ int64_t position(Player *p, bool limit)
     const Stage *stages[] = {&p->conversion, &p->effect};
     for (const Stage *s : stages)
         if (s->valid && s->effect) frames = std::max<int64_t>(AUDIOFX_MapOutputToInput(s->effect, frames), 0);
-    if (frames > p->jumpMark) {
-        p->basePosition = p->playCursor;
-        p->jumpMark = kNoMark;
-        p->displaySpeed = p->currentSpeed;
-        p->baseFrames = p->framesAtChange;
+    while (!p->jumpMarks.empty() && frames > p->jumpMarks.front().frames) {
+        const JumpMark &mark = p->jumpMarks.front();
+        p->basePosition = mark.basePosition;
+        p->baseFrames = mark.baseFrames;
+        p->displaySpeed = mark.speed;
+        p->jumpMarks.pop();
     }
     int64_t at = std::llround(static_cast<double>(frames - p->baseFrames) * p->displaySpeed) + p->basePosition;
     if (limit && p->rangeBegin <= p->rangeEnd) at = std::clamp(at, p->rangeBegin, p->rangeEnd);

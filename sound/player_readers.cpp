@@ -79,13 +79,14 @@ void account(Player *p, int64_t read_before)
 {
     if (p->readPosition != read_before) {
         p->playCursor += p->readPosition - read_before;
-        p->jumpMark = std::min(p->jumpMark, p->framesDelivered);
     } else if (p->requestedSpeed != p->currentSpeed) {
         p->playCursor += std::llround(static_cast<double>(p->framesDelivered - p->framesAtChange) * p->currentSpeed);
         p->framesAtChange = p->framesDelivered;
-        p->jumpMark = std::min(p->jumpMark, p->framesDelivered);
         p->currentSpeed = p->requestedSpeed;
+    } else {
+        return;
     }
+    p->jumpMarks.push(JumpMark{p->framesDelivered, p->playCursor, p->framesAtChange, p->currentSpeed});
 }
 
 } // namespace
@@ -138,7 +139,7 @@ int64_t block_reader(Player *p, float *destination, int64_t frames)
         p->freeBlocks = head;
         if (p->blocks) {
             p->playCursor += p->blocks->begin - head->end;
-            p->jumpMark = std::min(p->jumpMark, p->framesDelivered);
+            p->jumpMarks.push(JumpMark{p->framesDelivered, p->playCursor, p->framesAtChange, p->currentSpeed});
         }
     }
     return 0;

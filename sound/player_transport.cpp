@@ -82,7 +82,7 @@ int VELMPLAY_Start(VELMPLAYER handle)
         return 0;
     }
     place_start(p);
-    p->jumpMark = kNoMark;
+    p->jumpMarks.clear();
     p->cursorAtStart = p->doc ? VELMAUDIO_GetCursorPosition(p->doc) : 0;
     refresh_view(p);
     if (!open_stream(p)) {
@@ -181,7 +181,7 @@ int VELMPLAY_ChangeDevice(VELMPLAYER handle, const char *device_name)
         p->framesDelivered = p->baseFrames = p->framesAtChange = 0;
         const int64_t from = p->blocks ? p->blocks->current : p->readPosition;
         p->requestedPosition = p->basePosition = p->playCursor = from;
-        p->jumpMark = kNoMark;
+        p->jumpMarks.clear();
         p->device = device;
         p->outputFormat = format;
         rebuild_path(p);

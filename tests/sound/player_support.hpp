@@ -26,6 +26,8 @@ struct Events {
         auto *events = static_cast<Events *>(self);
         events->codes.push_back(event->event);
         if (event->event == 0x2001D) events->playCursor.push_back(*static_cast<const int64_t *>(event->data1));
+        if (event->event == VELMPLAY_NOTIFY_POSITION)
+            events->positions.push_back(*static_cast<const int64_t *>(event->data1));
         return event->event == events->refuse ? 0 : 1;
     }
     int Count(uint32_t code) const
@@ -36,6 +38,7 @@ struct Events {
     }
     std::vector<uint32_t> codes;
     std::vector<int64_t> playCursor;
+    std::vector<int64_t> positions; // of the position updates
     uint32_t refuse = 0;
 };
 
