@@ -62,12 +62,14 @@ int update(Player *p, bool *destroyed)
     p->updateBusy = true;
     refresh_view(p);
     int64_t at = position(p, false);
+    // Handlers of what follows may destroy the player; it is not touched
+    // after that.
     if (p->movesCursors()) {
-        VELMAUDIO_ShowPlayCursor(p->doc);
-        VELMAUDIO_UpdatePlayCursorPosition(p->doc, at);
-        apply_stop_rules(p, at);
+        VELMAUDIO doc = p->doc;
+        VELMAUDIO_ShowPlayCursor(doc);
+        VELMAUDIO_UpdatePlayCursorPosition(doc, at);
+        if (live(handle)) apply_stop_rules(p, at);
     }
-    // Handlers may destroy the player; it is not touched after that.
     int result = 1;
     if (live(handle) && p->notifies()) result = announce(p, VELMPLAY_NOTIFY_POSITION, &at, handle);
     if (!live(handle)) {
