@@ -119,7 +119,9 @@ VELMPLAYER VELMAUDIO_Player(VELMAUDIO doc)
 
 int VELMAUDIO_LinkPlayer(VELMAUDIO doc, VELMPLAYER player)
 {
-    if (!doc || !player || doc->player) return 0;
+    // Only a document's own player: destroying it unlinks it from there.
+    const velm::play::Player *p = velm::play::live(player);
+    if (!doc || !p || p->doc != doc || doc->player) return 0;
     doc->player = player;
     return 1;
 }

@@ -286,6 +286,25 @@ TEST_F(PlayerTest, ADestroyedPlayerIsRefused)
     EXPECT_FALSE(VELMPLAY_Stop(player));
     EXPECT_EQ(VELMPLAY_PlayPosition(player), -1);
     EXPECT_EQ(VELMPLAY_CreatePlayer(nullptr, 0), nullptr);
+    EXPECT_FALSE(VELMAUDIO_LinkPlayer(doc, player));
+
+    // A document links only its own player, and only one.
+    VELMAUDIO other = Open(1, 1.0);
+    ASSERT_NE(other, nullptr);
+    VELMPLAYER mine = VELMPLAY_CreatePlayer(doc, 0), theirs = VELMPLAY_CreatePlayer(other, 0);
+    EXPECT_FALSE(VELMAUDIO_LinkPlayer(doc, theirs));
+    EXPECT_TRUE(VELMAUDIO_LinkPlayer(doc, mine));
+    EXPECT_FALSE(VELMAUDIO_LinkPlayer(doc, mine));
+    EXPECT_FALSE(VELMAUDIO_UnlinkPlayer(doc, theirs));
+    EXPECT_EQ(VELMAUDIO_Player(doc), mine);
+    EXPECT_TRUE(VELMAUDIO_UnlinkPlayer(doc, mine));
+    EXPECT_EQ(VELMAUDIO_Player(doc), nullptr);
+    // Players not linked anywhere go with their documents.
+    EXPECT_EQ(VELMPLAY_GetStatus(theirs), VELMPLAY_STATUS_CREATED);
+    EXPECT_TRUE(VELMAUDIO_Close(other));
+    docs.pop_back();
+    EXPECT_EQ(VELMPLAY_GetStatus(theirs), 0);
+    EXPECT_EQ(VELMPLAY_GetStatus(mine), VELMPLAY_STATUS_CREATED);
     EXPECT_FALSE(VELMPLAY_SetChannelMask(nullptr, 0x3));
     EXPECT_FALSE(VELMPLAY_ChangeDevice(nullptr, "Virtual Device"));
 }
