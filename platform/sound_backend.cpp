@@ -1,5 +1,6 @@
 // The platform back-end's entry points: the system devices, then the
-// virtual device.
+// virtual device, matched to known records by the PCM name ("virtual" for
+// the virtual one).
 #include "platform/sound_backends.hpp"
 #include "sound/sound_internal.hpp"
 
@@ -18,6 +19,7 @@ int VELMSOUND_WINDOWS_DIRECTSOUND_Finalize(void)
 int VELMSOUND_WINDOWS_DIRECTSOUND_EnumerateDevices(VELMSOUNDDEVICE *list, int count)
 {
     if (!list || count < 0 || count > VELMSOUND_MAX_DEVICES) return count;
+    count = velmsound::EnumerateAlsaDevices(list, count);
     bool system_playback = false, system_capture = false;
     for (int i = 0; i < count; ++i) {
         const VELMSOUNDDEVICEINFO &info = list[i]->info;

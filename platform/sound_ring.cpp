@@ -19,6 +19,8 @@ namespace {
 
 enum State : int { kPlaying = 1, kCapturing = 2, kReady = 3, kEnded = 4 };
 
+constexpr float kLongestCapture = 20.0f; // seconds
+
 uint32_t BlockAlign(const _audio_format *format) { return 2u * static_cast<uint32_t>(format->numChannels); }
 
 uint32_t RingBytes(const _audio_format *format, float buffer_time, double buffer_count)
@@ -63,7 +65,6 @@ public:
           ring_(endpoint_->RingBytes() / block_ * block_), scratch_(ring_),
           period_(RealPeriod(std::round(buffer_time * 4.0 * 1000.0 * 0.125), endpoint_->Speed()))
     {
-        Fill();
         worker_.thread = std::thread([this] { Run(); });
     }
     ~PlaybackRing()
@@ -252,8 +253,17 @@ void InstallCaptureRingOps(VELMSOUNDDEVICE device)
     ops.IsCapturing = CaptureRingIsCapturing;
 }
 
-uint32_t PlaybackRingBytes(const _audio_format *format, float buffer_time) { return RingBytes(format, buffer_time, 4.0); }
-uint32_t CaptureRingBytes(const _audio_format *format, float buffer_time) { return RingBytes(format, buffer_time, 100.0); }
+uint32_t PlaybackRingBytes(const _audio_format *format, float buffer_time)
+{
+    return RingBytes(format, buffer_time, 4.0);
+}
+
+// A hundred buffer times, but never more than kLongestCapture seconds, so
+// that a long buffer time cannot make the ring absurdly large.
+uint32_t CaptureRingBytes(const _audio_format *format, float buffer_time)
+{
+    return RingBytes(format, std::min(buffer_time * 100.0f, kLongestCapture), 1.0);
+}
 
 void *OpenPlaybackRing(std::unique_ptr<PlaybackEndpoint> endpoint, float buffer_time,
                        VELMSOUND_StreamCallback callback, void *user, const _audio_format *format)

@@ -1,7 +1,8 @@
 // Playback and capture streams over an endpoint: the playback ring holds
 // four buffer times and is refilled by one worker thread every eighth of
 // it; the capture ring holds a hundred buffer times and is drained by its
-// worker at most every 200 ms.  Stream callbacks run on the worker.
+// worker at most every 200 ms.  Stream callbacks run on the worker only,
+// which fills the playback ring as soon as the stream opens.
 #ifndef VELMPLATFORM_SOUND_RING_HPP
 #define VELMPLATFORM_SOUND_RING_HPP
 
@@ -12,7 +13,8 @@
 
 namespace velmsound {
 
-// Ring sizes in bytes for a buffer time, whole frames.
+// Ring sizes in bytes for a buffer time, whole frames; the capture ring
+// holds at most 20 seconds.
 uint32_t PlaybackRingBytes(const _audio_format *format, float buffer_time);
 uint32_t CaptureRingBytes(const _audio_format *format, float buffer_time);
 

@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 using namespace soundtest;
 
 namespace {
@@ -24,18 +26,6 @@ struct Events {
 
     std::vector<std::string> added;
     int changed = 0;
-};
-
-// Keeps the logged errors.
-struct ErrorLog {
-    static void Sink(int kind, int, const char *message, void *self)
-    {
-        if (kind == BLDEBUG_KIND_ERROR) static_cast<ErrorLog *>(self)->lines.emplace_back(message);
-    }
-    ErrorLog() { BLDEBUG_SetSink(&ErrorLog::Sink, this); }
-    ~ErrorLog() { BLDEBUG_SetSink(nullptr, nullptr); }
-
-    std::vector<std::string> lines;
 };
 
 class SoundDevices : public ::testing::Test {
@@ -212,7 +202,7 @@ TEST_F(SoundDevices, AStreamOnARemovedDeviceFailsTheSanityCheck)
 
     BLSETTINGS_DeleteEx(nullptr, "libvelm.sound.testdevice");
     ASSERT_TRUE(VELMSOUND_UpdateDeviceList());
-    ErrorLog log;
+    LogLines log(BLDEBUG_KIND_ERROR);
     EXPECT_FALSE(VELMSOUND_Start(stream));
     EXPECT_FALSE(VELMSOUND_IsPlaying(stream));
     EXPECT_EQ(VELMSOUND_PlayCursorPosition(stream), 0);
@@ -220,6 +210,18 @@ TEST_F(SoundDevices, AStreamOnARemovedDeviceFailsTheSanityCheck)
     ASSERT_EQ(log.lines.size(), 4u);
     EXPECT_EQ(log.lines[0], "(VELMSOUND)_CheckDeviceSanity: Device sanity check failed!");
     EXPECT_EQ(source.calls.load(), 0);
+}
+
+TEST_F(SoundDevices, AFullListRefusesAnotherDevice)
+{
+    VELMSOUNDDEVICE full[VELMSOUND_MAX_DEVICES];
+    std::fill(std::begin(full), std::end(full), VELMSOUND_GetSoundDeviceByName("Virtual Device", 0));
+    ASSERT_NE(full[0], nullptr);
+    LogLines warnings(BLDEBUG_KIND_WARNING);
+    EXPECT_EQ(VELMSOUND_TEST_EnumerateDevices(full, VELMSOUND_MAX_DEVICES), VELMSOUND_MAX_DEVICES);
+    EXPECT_EQ(VELMSOUND_TEST_EnumerateDevices(full, VELMSOUND_MAX_DEVICES + 1), VELMSOUND_MAX_DEVICES + 1);
+    EXPECT_EQ(warnings.lines, std::vector<std::string>{
+                            "(VELMSOUND)_AppendDevice: Device list full, Audio IO Test Device left out!"});
 }
 
 TEST_F(SoundDevices, NullStreamsAndDevicesAreRefused)

@@ -34,6 +34,46 @@ private:
     std::string key_;
 };
 
+// Lists the devices a setting brings in (refreshing the list), and leaves
+// them out again.
+class Plugged {
+public:
+    Plugged(std::string key, const std::string &value) : key_(std::move(key))
+    {
+        BLSETTINGS_ChangeEx(nullptr, "%s=%s", key_.c_str(), value.c_str());
+        VELMSOUND_Initialize();
+    }
+    ~Plugged()
+    {
+        BLSETTINGS_DeleteEx(nullptr, "%s", key_.c_str());
+        VELMSOUND_UpdateDeviceList();
+    }
+    Plugged(const Plugged &) = delete;
+    Plugged &operator=(const Plugged &) = delete;
+
+private:
+    std::string key_;
+};
+
+// Keeps the log messages of one kind (BLDEBUG_KIND_*) while it lives.
+class LogLines {
+public:
+    explicit LogLines(int kind) : kind_(kind) { BLDEBUG_SetSink(&LogLines::Sink, this); }
+    ~LogLines() { BLDEBUG_SetSink(nullptr, nullptr); }
+    LogLines(const LogLines &) = delete;
+    LogLines &operator=(const LogLines &) = delete;
+
+    std::vector<std::string> lines;
+
+private:
+    static void Sink(int kind, int, const char *message, void *self)
+    {
+        auto *log = static_cast<LogLines *>(self);
+        if (kind == log->kind_) log->lines.emplace_back(message);
+    }
+    int kind_;
+};
+
 // A sine as the 16-bit samples a device plays.
 inline std::vector<int16_t> Tone(int rate, int channels, double seconds, double hz = 440.0)
 {

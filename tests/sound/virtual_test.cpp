@@ -4,6 +4,9 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <fstream>
+
 using namespace soundtest;
 
 namespace {
@@ -82,13 +85,13 @@ TEST_F(VirtualDevice, FramePositionCountsWhatWasHeard)
 
 TEST_F(VirtualDevice, PauseKeepsThePositionAndResumeLosesNothing)
 {
-    ToneSource source(Tone(44100, 2, 2.0));
+    ToneSource source(Tone(44100, 2, 4.0));
     const _audio_format format = Format(44100, 2);
     VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(playback, 0.05f, &ToneSource::Fill, &source, &format);
     ASSERT_NE(stream, nullptr);
     EXPECT_FALSE(VELMSOUND_Pause(stream)); // not playing yet
     ASSERT_TRUE(VELMSOUND_Start(stream));
-    ASSERT_TRUE(WaitFor([&] { return VELMSOUND_PlayCursorPosition(stream) > 10000; }));
+    ASSERT_TRUE(WaitFor([&] { return VELMSOUND_PlayCursorPosition(stream) > 4410; }));
     ASSERT_TRUE(VELMSOUND_Pause(stream));
     const int64_t paused_at = VELMSOUND_PlayCursorPosition(stream);
     std::this_thread::sleep_for(std::chrono::milliseconds(60));
@@ -142,6 +145,24 @@ TEST_F(VirtualDevice, ClosingAPausedStreamReturns)
     EXPECT_TRUE(VELMSOUND_Close(stream));
 }
 
+TEST_F(VirtualDevice, PlaysOnWhenItsFileCannotBeWritten)
+{
+    const std::string nowhere = dir.file("missing/folder/played.wav");
+    Setting out_elsewhere{"libvelm.sound.virtual.playbackfile", nowhere};
+    LogLines errors(BLDEBUG_KIND_ERROR);
+    ToneSource source(Tone(8000, 1, 0.1));
+    const _audio_format format = Format(8000, 1);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(playback, 0.05f, &ToneSource::Fill, &source, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(WaitFor([&] { return !VELMSOUND_IsPlaying(stream); }));
+    EXPECT_GE(VELMSOUND_PlayCursorPosition(stream), 800);
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+    EXPECT_FALSE(std::filesystem::exists(nowhere));
+    ASSERT_EQ(errors.lines.size(), 1u);
+    EXPECT_NE(errors.lines[0].find(nowhere), std::string::npos);
+}
+
 TEST_F(VirtualDevice, RefusesFormatsOtherThan16Bit)
 {
     ToneSource source({});
@@ -151,6 +172,8 @@ TEST_F(VirtualDevice, RefusesFormatsOtherThan16Bit)
     EXPECT_EQ(VELMSOUND_OpenPlayback(playback, 0.05f, nullptr, &source, &format), nullptr);
     EXPECT_EQ(VELMSOUND_OpenPlayback(nullptr, 0.05f, &ToneSource::Fill, &source, &format), nullptr);
     EXPECT_EQ(VELMSOUND_OpenPlayback(playback, 0.0f, &ToneSource::Fill, &source, &format), nullptr);
+    EXPECT_EQ(VELMSOUND_OpenPlayback(playback, 1e9f, &ToneSource::Fill, &source, &format), nullptr);
+    EXPECT_EQ(VELMSOUND_OpenCapture(capture, std::nanf(""), &ToneSource::Fill, &source, &format), nullptr);
 }
 
 class VirtualCapture : public VirtualDevice {
@@ -210,6 +233,36 @@ TEST_F(VirtualCapture, ARefusingConsumerEndsCapture)
     EXPECT_EQ(sink.calls.load(), 1);
     EXPECT_FALSE(VELMSOUND_Stop(stream));
     EXPECT_TRUE(VELMSOUND_Close(stream));
+}
+
+TEST_F(VirtualCapture, ALongBufferTimeStillCaptures)
+{
+    const std::vector<int16_t> tone = Tone(96000, 2, 0.1);
+    ASSERT_TRUE(WritePcm16(in_path, tone, 96000, 2));
+    CaptureSink sink;
+    const _audio_format format = Format(96000, 2);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenCapture(capture, 10.0f, &CaptureSink::Take, &sink, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(WaitFor([&] { return sink.Size() >= tone.size(); }));
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+    EXPECT_TRUE(std::equal(tone.begin(), tone.end(), sink.samples.begin()));
+}
+
+TEST_F(VirtualCapture, AFileThatIsNoAudioGivesSilence)
+{
+    {
+        std::ofstream junk(in_path, std::ios::binary);
+        junk << "RIFF\x10\0\0\0WAVEfmt this is not audio at all";
+    }
+    CaptureSink sink;
+    const _audio_format format = Format(8000, 1);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenCapture(capture, 0.05f, &CaptureSink::Take, &sink, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(WaitFor([&] { return sink.Size() >= 800; }));
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+    EXPECT_TRUE(std::all_of(sink.samples.begin(), sink.samples.end(), [](int16_t s) { return s == 0; }));
 }
 
 TEST_F(VirtualCapture, WithoutAFileDeliversSilenceAndCannotPause)
