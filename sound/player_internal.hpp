@@ -181,7 +181,8 @@ void refresh_view(Player *p);
 int64_t start_position(Player *p);
 
 // Position and update (player_position.cpp).
-int64_t position(Player *p, bool limit);
+// The document sample being heard, within the range played.
+int64_t position(Player *p);
 int update(Player *p, bool *destroyed);
 int update_callback(void *user);
 bool start_update_timer(Player *p);

@@ -28,7 +28,7 @@ void apply_stop_rules(Player *p, int64_t at)
 
 } // namespace
 
-int64_t position(Player *p, bool limit)
+int64_t position(Player *p)
 {
     int64_t frames = std::max<int64_t>(VELMSOUND_PlayCursorPosition(p->stream), 0);
     std::lock_guard guard(p->lock);
@@ -44,7 +44,7 @@ int64_t position(Player *p, bool limit)
         p->jumpMarks.pop();
     }
     int64_t at = std::llround(static_cast<double>(frames - p->baseFrames) * p->displaySpeed) + p->basePosition;
-    if (limit && p->rangeBegin <= p->rangeEnd) at = std::clamp(at, p->rangeBegin, p->rangeEnd);
+    if (p->rangeBegin <= p->rangeEnd) at = std::clamp(at, p->rangeBegin, p->rangeEnd);
     return at;
 }
 
@@ -61,7 +61,9 @@ int update(Player *p, bool *destroyed)
     }
     p->updateBusy = true;
     refresh_view(p);
-    int64_t at = position(p, false);
+    // The device goes on counting the silence after the end: the position
+    // stays within what is played.
+    int64_t at = position(p);
     // Handlers of what follows may destroy the player; it is not touched
     // after that.
     if (p->movesCursors()) {
@@ -117,5 +119,5 @@ using namespace velm::play;
 int64_t VELMPLAY_PlayPosition(VELMPLAYER handle)
 {
     Player *p = live(handle);
-    return p ? position(p, true) : -1;
+    return p ? position(p) : -1;
 }

@@ -101,7 +101,7 @@ int VELMPLAY_Stop(VELMPLAYER handle)
     if (p->status != VELMPLAY_STATUS_PLAYING && p->status != VELMPLAY_STATUS_OPENED) return 0;
     if (p->announces() && !announce(p, VELMPLAY_NOTIFY_STOP, handle, nullptr)) return 0;
     if (p->movesCursors() && p->moveCursorOnStop && VELMAUDIO_GetCursorPosition(p->doc) == p->cursorAtStart)
-        VELMAUDIO_SetCursorPosition(p->doc, position(p, true));
+        VELMAUDIO_SetCursorPosition(p->doc, position(p));
     VELMSOUND_Stop(p->stream);
     p->status = VELMPLAY_STATUS_STOPPED;
     return 1;

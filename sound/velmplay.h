@@ -67,7 +67,8 @@ VELM_API void VELMPLAY_Finalize(void);
  * load (format_text as AUDIO_LoadFile takes it, e.g. "AUTO"). */
 VELM_API VELMPLAYER VELMPLAY_CreatePlayer(VELMAUDIO doc, uint32_t flags);
 VELM_API VELMPLAYER VELMPLAY_CreateFilePlayer(const char *file_name, const char *format_text, uint32_t flags);
-/* Refuses a player that is not (or no longer) live. */
+/* Refuses a player that is not (or no longer) live; 1 only when it had a
+ * stream to close. */
 VELM_API int VELMPLAY_DestroyPlayer(VELMPLAYER player);
 
 /* Queues [min(a,b), max(a,b)) of the document's signal. */

@@ -64,10 +64,10 @@ TEST_F(PlayerTest, WithoutLoopTheSelectionEndsThePlayback)
 
 TEST_F(PlayerTest, SpeedIsWholeAndLimited)
 {
-    VELMAUDIO doc = Open(1, 20.0);
+    VELMAUDIO doc = Open(1, 60.0);
     ASSERT_NE(doc, nullptr);
     ASSERT_TRUE(VELMAUDIO_SetDrawOption(doc, kVisible));
-    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, 80000));
+    ASSERT_TRUE(VELMAUDIO_SetCursorPosition(doc, 240000));
     VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
     ASSERT_NE(player, nullptr);
     EXPECT_EQ(VELMPLAY_GetSpeed(player), 1.0f);
