@@ -134,7 +134,7 @@ VELMPLAYER VELMPLAY_CreatePlayer(VELMAUDIO doc, uint32_t flags)
 {
     if (!doc || !doc->signal) return nullptr;
     _audio_format format{};
-    if (!AUDIOSIGNAL_GetActiveFormat(doc->signal, &format)) return nullptr;
+    if (!AUDIOSIGNAL_GetActiveFormat(doc->signal, &format) || !stage_format_fits(format)) return nullptr;
     return to_handle(create(doc, nullptr, format, flags));
 }
 
@@ -144,7 +144,7 @@ VELMPLAYER VELMPLAY_CreateFilePlayer(const char *file_name, const char *format_t
     AUDIO_FILE *file = AUDIO_LoadFile(file_name, format_text);
     if (!file) return nullptr;
     const _audio_format format = AUDIO_GetAudioFileFormat(file);
-    if (!AUDIO_IsValidFormat(&format)) {
+    if (!AUDIO_IsValidFormat(&format) || !stage_format_fits(format)) {
         AUDIO_CloseFile(file);
         return nullptr;
     }

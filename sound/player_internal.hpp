@@ -167,6 +167,9 @@ void destroy_players_of(VELMAUDIO doc);
 void replace_signal(VELMAUDIO doc, AUDIOSIGNAL *signal);
 
 // Audio path (player_path.cpp).
+// Whether a stage may hold this format: five seconds of it stay well under
+// a hundred megabytes.
+bool stage_format_fits(const _audio_format &format);
 void rebuild_path(Player *p);
 void destroy_path(Player *p);
 int32_t buffer_callback(void *user, void *buffer, int32_t bytes);

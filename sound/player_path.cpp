@@ -55,6 +55,13 @@ void place_conversion(Player *p, const _audio_format &input)
 
 } // namespace
 
+bool stage_format_fits(const _audio_format &format)
+{
+    constexpr int64_t kMostSamplesPerSecond = 384000 * 8;
+    return format.sampleRate > 0 && format.numChannels > 0 &&
+           static_cast<int64_t>(format.sampleRate) * format.numChannels <= kMostSamplesPerSecond;
+}
+
 void Stage::reserve()
 {
     const int64_t capacity = static_cast<int64_t>(format.sampleRate) * 5000 * channels() / 1000;
@@ -158,6 +165,13 @@ int VELMPLAY_ChangeEffect(VELMPLAYER handle, const char *format, ...)
         if (!e.effect) return 0;
     }
     const _audio_format produced = AUDIOFX_GetOutputFormat(e.effect);
+    if (!stage_format_fits(produced)) {
+        // Back to no effect rather than a path the player cannot hold.
+        AUDIOFX_DestroyPath(e.effect);
+        e = Stage{};
+        rebuild_path(p);
+        return 0;
+    }
     // Samples already made in another shape would be misread: drop them.
     if (!same_shape(produced, e.format)) {
         e.fill = 0;

@@ -179,6 +179,12 @@ TEST_F(PlayerTest, AnEffectChangesWhatIsHeard)
     ASSERT_NE(doc, nullptr);
     VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
     EXPECT_FALSE(VELMPLAY_ChangeEffect(player, "nosuchstage[x=%d]", 1));
+    // A path too wide to hold leaves the player without an effect.
+    EXPECT_FALSE(VELMPLAY_ChangeEffect(player, "fmtconv[sr=%d,nc=%d]", 1000000, 64));
+    EXPECT_EQ(VELMPLAY_GetOutputFormat(player).sampleRate, kRate);
+    EXPECT_EQ(VELMPLAY_GetOutputFormat(player).numChannels, 1);
+    // The second change reconfigures the first one's path.
+    ASSERT_TRUE(VELMPLAY_ChangeEffect(player, "amplify[factor=%d]", 3));
     ASSERT_TRUE(VELMPLAY_ChangeEffect(player, "%s", "invert"));
     ASSERT_TRUE(VELMPLAY_SetPlayRange(player, 0, 2000));
     ASSERT_TRUE(StartLinked(doc, player));
