@@ -13,6 +13,7 @@
 #include "edit/velmregion.h"
 #include "edit/velmselection.h"
 #include "render/view/drawer_internal.hpp"
+#include "sound/velmplay.h"
 
 namespace {
 
@@ -58,10 +59,9 @@ int64_t sample_at(VELMDRAW d, int x)
     return std::fabs(s) < 9.0e18 ? static_cast<int64_t>(s) : 0;
 }
 
-// The play cursor is shown exactly while the document plays.
 bool playing(VELMDRAW d)
 {
-    return d->state->playCursor.shown != 0;
+    return VELMAUDIO_IsPlaying(d->document) != 0;
 }
 
 bool hit_lane(const Lane &lane)

@@ -8,6 +8,7 @@
 #include "edit/velmselection.h"
 #include "outside/signal/audiosignal.h"
 #include "render/view/velmscales.h"
+#include "sound/velmplay.h"
 
 namespace {
 
@@ -117,7 +118,9 @@ int VELMAUDIO_SetChannelMask(VELMAUDIO doc, uint32_t mask)
     const int channels = AUDIOSIGNAL_NumChannels(doc->signal);
     for (int i = 0; i < channels && i < 32; ++i) {
         const bool on = (mask >> i) & 1u;
-        if (on ? AUDIOSIGNAL_EnableChannel(doc->signal, i) : AUDIOSIGNAL_DisableChannel(doc->signal, i)) changed = true;
+        if (!(on ? AUDIOSIGNAL_EnableChannel(doc->signal, i) : AUDIOSIGNAL_DisableChannel(doc->signal, i))) continue;
+        changed = true;
+        if (doc->player) VELMPLAY_SetChannelGain(VELMAUDIO_Player(doc), i, on ? 1.0 : 0.0);
     }
     if (changed || doc->state->channelMask != mask) {
         doc->state->channelMask = mask;

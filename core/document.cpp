@@ -13,6 +13,7 @@
 #include "edit/velmregion.h"
 #include "edit/velmundo.h"
 #include "outside/signal/audiosignal.h"
+#include "sound/player_internal.hpp"
 #include "sound/recorder_guard.hpp"
 
 static int release_reference(VELMAUDIO doc);
@@ -145,6 +146,9 @@ void copy_text(char *buffer, size_t size, const char *text)
 int close_document(VELMAUDIO doc)
 {
     UnRegisterObject(doc);
+    // No player may read the document once it is gone; a closing document
+    // takes its players with it, unasked.
+    play::destroy_players_of(doc);
     if (doc->dispatcher) {
         BLNOTIFY_DestroyDispatcher(doc->dispatcher);
         doc->dispatcher = nullptr;
@@ -311,6 +315,8 @@ static int release_reference(VELMAUDIO doc)
 
     // Stopped first, so that what was recorded counts as a change below.
     velm::end_document_recordings(doc);
+    // The question whether to close a modified document is asked in silence.
+    const bool paused = VELMAUDIO_GetPlayStatus(doc) == VELMPLAY_STATUS_PLAYING && VELMAUDIO_PlayPause(doc);
     if (doc->state->status & STATUS_MODIFIED) {
         doc->closeQuery = 1;
         const int answer = BLNOTIFY_SendEvent(doc->dispatcher, nullptr, 0, 0x20009, doc, nullptr);
@@ -320,7 +326,10 @@ static int release_reference(VELMAUDIO doc)
         // A handler that took a reference keeps the document alive.
         const bool kept = doc->references >= 1;
         MutexUnlock(doc->referenceLock);
-        if (kept) return 0;
+        if (kept) {
+            if (paused) VELMAUDIO_PlayResume(doc);
+            return 0;
+        }
     }
     // Closed from a handler of a draw: the draw is still using the document.
     if (doc->drawing) {
@@ -335,6 +344,7 @@ static int unload(VELMAUDIO doc)
     velm::end_document_recordings(doc);
     VELMSTATE *state = doc->state;
     if (!(state->status & STATUS_HAS_FILE) || (state->status & STATUS_MODIFIED) || doc->drawing) return 0;
+    velm::play::destroy_players_of(doc);
     VELMDRAW_Destroy(doc->renderer);
     doc->renderer = nullptr;
     if (doc->signal) AUDIOSIGNAL_Destroy(VELMAUDIO_SetAudioSignal(doc, nullptr));
@@ -421,7 +431,7 @@ AUDIOSIGNAL *VELMAUDIO_SetAudioSignal(VELMAUDIO doc, AUDIOSIGNAL *signal)
     // A signal the document lets go of may be freed next: nothing may record into it.
     velm::end_signal_recordings(previous);
     if (previous) AUDIOSIGNAL_SetParentObject(previous, nullptr, nullptr);
-    doc->signal = signal;
+    velm::play::replace_signal(doc, signal);
     if (signal) AUDIOSIGNAL_SetParentObject(signal, doc, velm::signal_callback);
     return previous;
 }

@@ -82,10 +82,16 @@ VELM_API int VELMAUDIO_ChangeChannelControlVisibility(VELMAUDIO doc, int slot, i
 VELM_API int VELMAUDIO_IsChannelControlVisible(VELMAUDIO doc, int slot, uint32_t mask);
 
 /* The play cursor: its position while shown (else -1), whether it is shown,
- * and hiding it.  The player moves and shows it. */
+ * showing and hiding it.  Showing needs a live player.  Set (the user moves
+ * it; playback follows) and Update (playback advances it) answer the
+ * previous position, 0 when nothing changed, -1 when no shown play cursor of
+ * a live player exists. */
 VELM_API int64_t VELMAUDIO_GetPlayCursorPosition(VELMAUDIO doc);
 VELM_API int     VELMAUDIO_PlayCursorVisible(VELMAUDIO doc);
+VELM_API int     VELMAUDIO_ShowPlayCursor(VELMAUDIO doc);
 VELM_API int     VELMAUDIO_HidePlayCursor(VELMAUDIO doc);
+VELM_API int64_t VELMAUDIO_SetPlayCursorPosition(VELMAUDIO doc, int64_t position);
+VELM_API int64_t VELMAUDIO_UpdatePlayCursorPosition(VELMAUDIO doc, int64_t position);
 /* Shows the mute indicator of each waveform display of an active channel
  * whose playback gain is zero (all of them with force); needs a renderer. */
 VELM_API int     VELMAUDIO_UpdateMuteChannelControlsVisibility(VELMAUDIO doc, int force);

@@ -8,6 +8,7 @@
 #include "core/velmqueries.h"
 #include "core/velmtimeconv.h"
 #include "edit/edit_internal.hpp"
+#include "sound/velmplay.h"
 #include "sound/velmrecord.h"
 
 namespace {
@@ -154,6 +155,9 @@ int VELMAUDIO_ChangeAudioFormat(VELMAUDIO doc, const _audio_format *format, cons
     // Frames recorded during the conversion would be lost from its result.
     if (VELMAUDIO_IsRecording(doc) && !VELMAUDIO_RecordStop(doc)) return 0;
 
+    // A player reads in the old format: it stops first, and a refused stop
+    // leaves the format as it is.
+    if (VELMAUDIO_Player(doc) && !VELMAUDIO_PlayStop(doc)) return 0;
     if (!VELMAUDIO_Transform(doc, effect.c_str(), label ? label : "Change Audio Format")) return 0;
     if (wanted.sampleRate == current.sampleRate) return 1;
     VELMAUDIO_SetCursorPosition(doc, VELMAUDIO_TimeToSample(doc, cursor));

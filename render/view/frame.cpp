@@ -236,8 +236,7 @@ int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
 }
 
 // What every frame draws last on the output target, each piece saving the
-// pixels it covers.  Gain buttons belong here while playing; without a
-// player there is no playing yet.
+// pixels it covers.
 int draw_overlay_tail(VELMDRAW d, bool empty)
 {
     const VELMSTATE *s = d->state;
@@ -249,6 +248,7 @@ int draw_overlay_tail(VELMDRAW d, bool empty)
         ok &= draw_zoom_limit_bar(d, 1);
         ok &= draw_zoom_limit_bar(d, 2);
     }
+    ok &= draw_gain_buttons(d);
     layout.cursorSliders = {};
     if (empty) {
         layout.selectionSliderCount = 0;

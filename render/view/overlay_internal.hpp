@@ -53,6 +53,8 @@ int draw_track_selections(VELMDRAW d, const VELMSTATE *state, int first, int las
 int update_selecting(VELMDRAW d, const VELMSTATE *drawn, const VELMSTATE *state);
 int draw_selecting_label(VELMDRAW d, const VELMSTATE *state);
 int draw_zoom_limit_bar(VELMDRAW d, int which);
+// While playing, a gain button over each shown channel button of a lane.
+int draw_gain_buttons(VELMDRAW d);
 int draw_cursor(VELMDRAW d, const VELMCURSOR &cursor);
 int draw_navigator_cursor(VELMDRAW d, const VELMCURSOR &cursor);
 // Committed selections (mode 0) and the selection being made (its own mode)

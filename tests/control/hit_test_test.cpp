@@ -15,6 +15,8 @@
 #include "render/view/drawer_internal.hpp"
 #include "render/view/velmoverlays.h"
 #include "render/view/view_support.hpp"
+#include "sound/sound_support.hpp"
+#include "sound/velmplay.h"
 #include "testaudio.hpp"
 #include "widgets/guiapp.h"
 
@@ -114,14 +116,22 @@ TEST_F(HitTest, LanesAndTheirChannelSelectBands)
 
 TEST_F(HitTest, BandsWhilePlayingFollowTheChannelButtons)
 {
-    // The play cursor shows while the document plays.
-    drawer()->state->playCursor.shown = 1;
+    // Played through the virtual device, held paused.
+    soundtest::Setting device{"libvelm.playback.devicename", "Virtual Device"};
+    soundtest::Setting output{"libvelm.sound.virtual.playbackfile", dir.file("played.wav")};
+    VELMPLAY_Initialize();
+    ASSERT_TRUE(VELMAUDIO_PlayStart(doc, VELMPLAY_MODE_LIMITS, 0, 0));
+    ASSERT_TRUE(VELMAUDIO_PlayPause(doc));
     const _VELMRECT &a = lane(0).area;
     ASSERT_GT(a.height, 70);
     EXPECT_EQ(at(lane_x(0), a.top), 0x3000u);
     ASSERT_TRUE(VELMAUDIO_ChangeChannelControlVisibility(doc, 0, 1, 1));
     EXPECT_EQ(at(lane_x(0), a.top + 59), 0x103000u);
     EXPECT_EQ(at(lane_x(0), a.top + 60), 0x3000u);
+    // Stopped, the plain band is back.
+    ASSERT_TRUE(VELMAUDIO_PlayStop(doc));
+    EXPECT_EQ(at(lane_x(0), a.top + 59), 0x3000u);
+    EXPECT_EQ(at(lane_x(0), a.top), 0x103000u);
 }
 
 TEST_F(HitTest, VerticalScalesAndTheirKindBox)

@@ -8,6 +8,7 @@
 #include "core/velmversion.h"
 #include "edit/velmcustomtrack.h"
 #include "edit/velmselection.h"
+#include "sound/velmplay.h"
 
 #include <stdio.h>
 #include <string.h>
@@ -45,6 +46,9 @@ int main(void)
     CHECK(VELMAUDIO_SampleToTimeString(doc, 4000, text, sizeof text) == 1);
     CHECK(strcmp(text, "0.500") == 0);
     CHECK(VELMAUDIO_AddCustomTrack(doc, "words") == 1);
+    CHECK(VELMAUDIO_IsPlaying(doc) == 0);
+    CHECK(VELMAUDIO_PlayStart(doc, VELMPLAY_MODE_SELECTIONS, 0, 0) == 0);
+    CHECK(VELMPLAY_GetInputFormat(NULL).sampleRate == 0);
     CHECK(VELMAUDIO_Close(doc) == 1);
     CHECK(VELMAUDIO_Close(NULL) == 0);
     VELM_Finalize();

@@ -2,10 +2,14 @@
 // indicators, which follow the renderer's layout.
 #include <gtest/gtest.h>
 
+#include <QCoreApplication>
+
 #include <string>
 
 #include "core/velmconfig.h"
 #include "core/velmnavigation.h"
+#include "sound/sound_support.hpp"
+#include "sound/velmplay.h"
 #include "testaudio.hpp"
 #include "view_support.hpp"
 
@@ -98,6 +102,104 @@ TEST_F(PlayCursor, MuteIndicatorsFollowTheWaveformDisplays)
     ASSERT_TRUE(VELMAUDIO_ChangeChannelControlVisibility(stereo, 3, 2, 1));
     ASSERT_TRUE(VELMAUDIO_UpdateMuteChannelControlsVisibility(stereo, 0));
     EXPECT_EQ(indicators(stereo), (0x1u << 2) | (0x2u << 6));
+}
+
+// Plays a document through the virtual device, held paused with the play
+// cursor at a known sample.
+class Playing : public PlayCursor {
+protected:
+    static void SetUpTestSuite() { VELMPLAY_Initialize(); }
+
+    // With an application object the timers tick through Qt's event loop.
+    bool play_paused(VELMAUDIO doc, int64_t at)
+    {
+        return VELMAUDIO_PlayStart(doc, 1, 0, 0) && soundtest::WaitFor([&] {
+                   QCoreApplication::processEvents();
+                   return VELMAUDIO_PlayCursorVisible(doc) != 0;
+               }) &&
+               VELMAUDIO_PlayPause(doc) && VELMAUDIO_SetPlayCursorPosition(doc, at) >= 0;
+    }
+
+    soundtest::Setting device{"libvelm.playback.devicename", "Virtual Device"};
+    soundtest::Setting output{"libvelm.sound.virtual.playbackfile", dir.file("played.wav")};
+};
+
+TEST_F(Playing, MuteIndicatorsFollowThePlayersGains)
+{
+    viewtest::ensure_application();
+    VELMAUDIO doc = open(2);
+    ASSERT_NE(doc, nullptr);
+    viewtest::Canvas canvas(640, 400);
+    ASSERT_TRUE(VELMAUDIO_SetDrawOption(doc, 0x1 | 0x10000));
+    ASSERT_TRUE(canvas.draw(doc));
+    ASSERT_TRUE(play_paused(doc, 4000));
+    VELMPLAYER player = VELMAUDIO_Player(doc);
+    ASSERT_TRUE(VELMAUDIO_UpdateMuteChannelControlsVisibility(doc, 0));
+    EXPECT_EQ(indicators(doc), 0u);
+
+    // The second channel muted: its display shows indicator 2.
+    ASSERT_TRUE(VELMPLAY_SetChannelGain(player, 1, 0.0));
+    ASSERT_TRUE(VELMAUDIO_UpdateMuteChannelControlsVisibility(doc, 0));
+    EXPECT_EQ(indicators(doc), 0x2u << 2);
+    ASSERT_TRUE(VELMPLAY_SetChannelGain(player, 0, 0.0));
+    ASSERT_TRUE(VELMAUDIO_UpdateMuteChannelControlsVisibility(doc, 0));
+    EXPECT_EQ(indicators(doc), 0x1u | (0x2u << 2));
+
+    // Hiding the play cursor at the end of playback takes them away.
+    ASSERT_TRUE(VELMAUDIO_PlayStop(doc));
+    EXPECT_EQ(indicators(doc), 0u);
+}
+
+TEST_F(Playing, GainButtonsShowEachChannelsGain)
+{
+    viewtest::ensure_application();
+    VELMAUDIO doc = open(2);
+    ASSERT_NE(doc, nullptr);
+    viewtest::Canvas canvas(640, 400);
+    ASSERT_TRUE(VELMAUDIO_SetDrawOption(doc, 0x1 | 0x10000));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QImage still = canvas.output();
+    ASSERT_TRUE(play_paused(doc, 4000));
+    VELMPLAYER player = VELMAUDIO_Player(doc);
+    ASSERT_TRUE(VELMPLAY_SetChannelGain(player, 0, 0.0));
+    ASSERT_TRUE(VELMPLAY_SetChannelGain(player, 1, 0.5));
+    ASSERT_TRUE(VELMAUDIO_UpdateMuteChannelControlsVisibility(doc, 1));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QImage playing = canvas.output();
+    EXPECT_EQ(viewtest::compare_golden(playing, "playing_gain_buttons"), "");
+
+    // The buttons sit at the lanes' right ends, the first channel's at the
+    // top, the second's at the bottom, darker than the view under them.
+    auto darkened = [&](int left, int top) {
+        int n = 0;
+        for (int y = top; y < top + 30; ++y)
+            for (int x = left; x < left + 40; ++x) n += qGray(playing.pixel(x, y)) < qGray(still.pixel(x, y));
+        return n;
+    };
+    EXPECT_GT(darkened(530, 10), 600);
+    EXPECT_GT(darkened(530, 338), 600);
+    EXPECT_EQ(darkened(400, 338), 0);
+
+    // Stopped, the frame carries no buttons again.
+    ASSERT_TRUE(VELMAUDIO_PlayStop(doc));
+    ASSERT_TRUE(canvas.draw(doc));
+    EXPECT_EQ(viewtest::count_differences(canvas.output(), still), 0);
+}
+
+TEST_F(Playing, ThePlayCursorDrawsWhereTheUserPutsIt)
+{
+    viewtest::ensure_application();
+    VELMAUDIO doc = open(1);
+    ASSERT_NE(doc, nullptr);
+    viewtest::Canvas canvas(640, 400);
+    ASSERT_TRUE(VELMAUDIO_SetDrawOption(doc, 0x1));
+    ASSERT_TRUE(play_paused(doc, 2000));
+    ASSERT_TRUE(canvas.draw(doc));
+    const QImage early = canvas.output();
+    EXPECT_EQ(VELMAUDIO_SetPlayCursorPosition(doc, 6000), 2000);
+    ASSERT_TRUE(canvas.draw(doc));
+    EXPECT_GT(viewtest::count_differences(canvas.output(), early), 100);
+    ASSERT_TRUE(VELMAUDIO_PlayStop(doc));
 }
 
 } // namespace
