@@ -128,7 +128,7 @@ int32_t VELMUTIL_ConvertRealYtoDisplayY(const VELMAREA *area, double y)
 double VELMUTIL_ConvertDisplayYtoRealY(const VELMAREA *area, int32_t row)
 {
     if (!area) return 0.0;
-    const double v = safe_ratio((double{area->yOrigin} - row) * area->yExtent, area->rect.height);
+    const double v = safe_ratio((static_cast<double>(area->yOrigin) - row) * area->yExtent, area->rect.height);
     return area->displayToRealY ? area->displayToRealY(v) : v;
 }
 
@@ -142,6 +142,6 @@ int32_t VELMUTIL_ConvertRealXtoDisplayX(const VELMAREA *area, double x)
 double VELMUTIL_ConvertDisplayXtoRealX(const VELMAREA *area, int32_t column)
 {
     if (!area) return 0.0;
-    const double v = safe_ratio((double{column} - area->xOrigin) * area->xExtent, area->rect.width);
+    const double v = safe_ratio((static_cast<double>(column) - area->xOrigin) * area->xExtent, area->rect.width);
     return area->displayToRealX ? area->displayToRealX(v) : v;
 }

@@ -70,7 +70,7 @@ int VELMAUDIO_RemoveDC(VELMAUDIO doc, const char *label)
         offsets[static_cast<size_t>(i)] = -VELMAUDIO_GetChannelSamplesSum(doc, i) / static_cast<double>(length);
     char vector[1024];
     if (BLSTRING_SetDoubleVectorToString(offsets.data(), channels, vector, sizeof vector) < 0) return 0;
-    char effect[1024];
+    char effect[sizeof vector + 32];
     std::snprintf(effect, sizeof effect, "GAIN[offsets=%s]", vector);
     return VELMAUDIO_TransformSelection(doc, effect, label ? label : "Remove DC");
 }

@@ -170,7 +170,6 @@ bool region_held(VELMDRAW d)
 int dispatch(VELMDRAW d, uint32_t mask, const VELMSTATE *drawn)
 {
     VELMCANVAS canvas = d->canvas;
-    const int last = d->columns - 1;
     int ok = 1;
     uint32_t work = mask & ~0x1000u;
     // While a region is held its tint is drawn again in every frame, under
