@@ -28,6 +28,12 @@ void usage(FILE *out)
                  "        runs edits in order (--select FROM:TO, --cut, --paste, --clear, --trim,\n"
                  "        --silence, --reverse, --effect SCRIPT, --remove-dc, --append FILE, ...)\n"
                  "        and saves the result as OUT; see velm edit --help\n"
+                 "  devices\n"
+                 "        the sound devices that can play or record\n"
+                 "  play [FILE] [--from SECONDS] [--to SECONDS] [--device NAME]\n"
+                 "        plays FILE (or the demo sound) and returns when it has been heard\n"
+                 "  record OUT --seconds SECONDS [--rate HZ] [--channels 1|2] [--device NAME]\n"
+                 "        records from a capture device and saves the sound as OUT\n"
                  "  version\n"
                  "        the library's version\n");
 }
@@ -45,6 +51,9 @@ int main(int argc, char **argv)
     if (std::strcmp(command, "render") == 0) return velmtool::run_render(argc - 2, argv + 2);
     if (std::strcmp(command, "convert") == 0) return velmtool::run_convert(argc - 2, argv + 2);
     if (std::strcmp(command, "edit") == 0) return velmtool::run_edit(argc - 2, argv + 2);
+    if (std::strcmp(command, "devices") == 0) return velmtool::run_devices(argc - 2, argv + 2);
+    if (std::strcmp(command, "play") == 0) return velmtool::run_play(argc - 2, argv + 2);
+    if (std::strcmp(command, "record") == 0) return velmtool::run_record(argc - 2, argv + 2);
     if (std::strcmp(command, "version") == 0) {
         std::printf("%s\n", VELMVERSION_String());
         return 0;

@@ -62,6 +62,9 @@ int run_info(int argc, char **argv);
 int run_render(int argc, char **argv);
 int run_convert(int argc, char **argv);
 int run_edit(int argc, char **argv);
+int run_devices(int argc, char **argv);
+int run_play(int argc, char **argv);
+int run_record(int argc, char **argv);
 
 } // namespace velmtool
 
