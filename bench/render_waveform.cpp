@@ -22,45 +22,15 @@
 #include "core/velmnavigation.h"
 #include "edit/velmselection.h"
 #include "render/view/velmdraw.h"
+#include "bench/hour_source.hpp"
 
 namespace {
 
-constexpr int kRate = 44100;
-constexpr int64_t kFrames = int64_t{3600} * kRate;
+using velmbench::kFrames;
+using velmbench::kRate;
 constexpr int kColumns = 2000;
 // No margins, borders or scales: the lanes are exactly kColumns wide.
 constexpr uint32_t kBareFlags = 0x4 | 0x8 | 0x40 | 0x80 | 0x100;
-
-std::string source_path()
-{
-    return (std::filesystem::temp_directory_path() / "velm-bench-render-hour.wav").string();
-}
-
-// Tones whose loudness changes every few seconds, different per channel.
-void make_source()
-{
-    const std::string path = source_path();
-    if (std::filesystem::exists(path) && std::filesystem::file_size(path) == static_cast<uintmax_t>(44 + kFrames * 4)) return;
-    SF_INFO info{};
-    info.samplerate = kRate;
-    info.channels = 2;
-    info.format = SF_FORMAT_WAV | SF_FORMAT_PCM_16;
-    SNDFILE *f = sf_open(path.c_str(), SFM_WRITE, &info);
-    constexpr int64_t chunk = 65536;
-    std::vector<short> block(2 * chunk);
-    for (int64_t at = 0; at < kFrames; at += chunk) {
-        const int64_t n = std::min(chunk, kFrames - at);
-        for (int64_t i = 0; i < n; ++i) {
-            const int64_t t = at + i;
-            const double loud = 0.2 + 0.7 * std::fabs(std::sin(static_cast<double>(t / (kRate * 3)) * 1.7));
-            const double wave = std::sin(static_cast<double>(t % 100) * (2.0 * M_PI / 100.0));
-            block[2 * i] = static_cast<short>(12000 * loud * wave);
-            block[2 * i + 1] = static_cast<short>(9000 * loud * wave * (t % 7 == 0 ? -1 : 1));
-        }
-        sf_writef_short(f, block.data(), n);
-    }
-    sf_close(f);
-}
 
 struct Session {
     VELMAUDIO doc = nullptr;
@@ -72,8 +42,7 @@ struct Session {
         static char name[] = "bench_render_waveform";
         static char *argv[] = {name, nullptr};
         if (!QGuiApplication::instance()) new QGuiApplication(argc, argv);
-        make_source();
-        doc = VELMAUDIO_Open(source_path().c_str(), "AUTO");
+        doc = VELMAUDIO_Open(velmbench::hour_source().c_str(), "AUTO");
         canvas = VELMCANVAS_CreateCanvasQT(nullptr, kColumns, height);
         VELMCANVAS_ResizeCanvas(canvas, kColumns, height);
         VELMAUDIO_SetDrawProperty(doc, 2, static_cast<int32_t>(kBareFlags | kind));
