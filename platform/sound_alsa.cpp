@@ -142,7 +142,9 @@ public:
     bool Pause() override
     {
         std::lock_guard guard(lock);
-        if (snd_pcm_pause(pcm.get(), 1) < 0) return false;
+        // A PCM that has not begun yet (no data so far, or prepared again
+        // after an underrun) cannot pause; it only has to stay unstarted.
+        if (snd_pcm_state(pcm.get()) != SND_PCM_STATE_PREPARED && snd_pcm_pause(pcm.get(), 1) < 0) return false;
         running = false;
         return true;
     }

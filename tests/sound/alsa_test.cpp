@@ -55,6 +55,25 @@ TEST_F(AlsaNull, PlaysAShortSoundThatEndsByItself)
     EXPECT_TRUE(VELMSOUND_Close(stream));
 }
 
+TEST_F(AlsaNull, PausesAndResumesRightAfterStart)
+{
+    ToneSource source(Tone(44100, 2, 0.3));
+    _audio_format format = Format(44100, 2);
+    ASSERT_EQ(VELMSOUND_SelectPlaybackDevice(device, &format), device);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(device, 0.05f, &ToneSource::Fill, &source, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(VELMSOUND_Pause(stream));
+    const int64_t held = VELMSOUND_PlayCursorPosition(stream);
+    EXPECT_TRUE(VELMSOUND_IsPlaying(stream));
+    EXPECT_EQ(VELMSOUND_PlayCursorPosition(stream), held);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    ASSERT_TRUE(WaitFor([&] { return !VELMSOUND_IsPlaying(stream); }));
+    EXPECT_EQ(source.offered.load(), source.samples.size());
+    EXPECT_GE(VELMSOUND_PlayCursorPosition(stream), static_cast<int64_t>(source.samples.size() / 2));
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+}
+
 TEST_F(AlsaNull, CaptureDeliversSilence)
 {
     CaptureSink sink;
