@@ -236,6 +236,22 @@ TEST_F(PlayerTest, AFilePlayerPlaysAFile)
     for (size_t i = 0; i < tone.size(); ++i) ASSERT_NEAR(played[i], tone[i], 1.5 / 32768) << i;
 }
 
+TEST_F(PlayerTest, AFilePlayerDestroyedWhileTheDeviceReadsLetsTheDeviceFinishFirst)
+{
+    // A long device buffer keeps the device thread reading the file while
+    // the player goes away.
+    soundtest::Setting buffer{"libvelm.playback.osbuffersize", "4"};
+    const std::string path = dir.file("long.wav");
+    ASSERT_TRUE(velmtest::write_audio(path, velmtest::sine(kRate, 2, kRate * 40, 300.0, 0.4), kRate, 2));
+    for (int round = 0; round < 8; ++round) {
+        VELMPLAYER player = VELMPLAY_CreateFilePlayer(path.c_str(), "AUTO", 0);
+        ASSERT_NE(player, nullptr);
+        ASSERT_TRUE(VELMPLAY_Start(player));
+        EXPECT_TRUE(VELMPLAY_DestroyPlayer(player));
+        EXPECT_EQ(VELMPLAY_GetStatus(player), 0);
+    }
+}
+
 TEST_F(PlayerTest, WaitingRunsTheUpdatesUntilTheEnd)
 {
     VELMAUDIO doc = Open(1, 4.0);
