@@ -340,6 +340,15 @@ TEST_F(RecordControl, RefusedRequests)
     EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 1);
     EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 0);
     EXPECT_EQ(destroyed.count, 0);
+    // A destroyed recorder's handle is refused like a null one.
+    EXPECT_EQ(VELMRECORD_GetStatus(r), VELMRECORD_STATUS_CLOSED);
+    EXPECT_EQ(VELMRECORD_IsRecording(r), 0);
+    EXPECT_EQ(VELMRECORD_RecordPosition(r), -1);
+    EXPECT_EQ(VELMRECORD_Start(r, nullptr), 0);
+    EXPECT_EQ(VELMRECORD_Stop(r), 0);
+    EXPECT_EQ(VELMRECORD_ChangeDevice(r, "Virtual Device"), 0);
+    EXPECT_EQ(VELMRECORD_SetGUITimer(r, nullptr, nullptr), 0);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
 
     VELMAUDIO_SetEditable(doc, 0);
     EXPECT_EQ(VELMAUDIO_RecordStart(doc, 0, nullptr), nullptr);
