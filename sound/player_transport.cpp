@@ -45,6 +45,15 @@ bool path_fits_device(const Player *p)
            p->last->format.numChannels == p->outputFormat.numChannels;
 }
 
+// Whether the shell lets the step go ahead: false when a handler refused,
+// or destroyed the player meanwhile.
+bool agreed(Player *p, uint32_t event)
+{
+    const VELMPLAYER handle = to_handle(p);
+    if (!p->announces()) return true;
+    return announce(p, event, handle, nullptr) && live(handle);
+}
+
 int move_to(Player *p, int64_t requested)
 {
     if (!p->doc) return 0;
@@ -73,7 +82,7 @@ int VELMPLAY_Start(VELMPLAYER handle)
         p->status = VELMPLAY_STATUS_FAILED;
         return 0;
     }
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_START, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_START)) return 0;
     p->device = device;
     p->outputFormat = format;
     rebuild_path(p);
@@ -99,7 +108,7 @@ int VELMPLAY_Stop(VELMPLAYER handle)
     Player *p = live(handle);
     if (!p || !p->stream) return 0;
     if (p->status != VELMPLAY_STATUS_PLAYING && p->status != VELMPLAY_STATUS_OPENED) return 0;
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_STOP, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_STOP)) return 0;
     if (p->movesCursors() && p->moveCursorOnStop && VELMAUDIO_GetCursorPosition(p->doc) == p->cursorAtStart)
         VELMAUDIO_SetCursorPosition(p->doc, position(p));
     VELMSOUND_Stop(p->stream);
@@ -111,7 +120,7 @@ int VELMPLAY_Pause(VELMPLAYER handle)
 {
     Player *p = live(handle);
     if (!p || p->status != VELMPLAY_STATUS_PLAYING) return 0;
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_PAUSE, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_PAUSE)) return 0;
     if (!VELMSOUND_Pause(p->stream)) return 0;
     p->status = VELMPLAY_STATUS_OPENED;
     return 1;
@@ -121,7 +130,7 @@ int VELMPLAY_Resume(VELMPLAYER handle)
 {
     Player *p = live(handle);
     if (!p || p->status != VELMPLAY_STATUS_OPENED || !p->stream) return 0;
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_RESUME, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_RESUME)) return 0;
     if (!VELMSOUND_Start(p->stream)) return 0;
     p->status = VELMPLAY_STATUS_PLAYING;
     return 1;

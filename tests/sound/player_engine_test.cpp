@@ -331,6 +331,37 @@ TEST_F(PlayerTest, ADestroyedPlayerIsRefused)
     EXPECT_FALSE(VELMPLAY_ChangeDevice(nullptr, "Virtual Device"));
 }
 
+TEST_F(PlayerTest, AHandlerMayDestroyThePlayerItIsToldAbout)
+{
+    VELMAUDIO doc = Open(1, 4.0);
+    ASSERT_NE(doc, nullptr);
+    struct Doom {
+        uint32_t code;
+    } doom{0};
+    auto destroy = [](const BLNotifyEvent *event, void *user) {
+        if (event->event == static_cast<Doom *>(user)->code)
+            VELMPLAY_DestroyPlayer(static_cast<VELMPLAYER>(event->data1));
+        return 1;
+    };
+    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), destroy, &doom);
+    // Each call fails once its announcement took the player away.
+    for (uint32_t code : {VELMPLAY_NOTIFY_START, VELMPLAY_NOTIFY_PAUSE, VELMPLAY_NOTIFY_RESUME, VELMPLAY_NOTIFY_STOP}) {
+        doom.code = 0;
+        VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+        ASSERT_NE(player, nullptr);
+        if (code != VELMPLAY_NOTIFY_START) ASSERT_TRUE(VELMPLAY_Start(player));
+        if (code == VELMPLAY_NOTIFY_RESUME) ASSERT_TRUE(VELMPLAY_Pause(player));
+        doom.code = code;
+        const int result = code == VELMPLAY_NOTIFY_START   ? VELMPLAY_Start(player)
+                           : code == VELMPLAY_NOTIFY_PAUSE ? VELMPLAY_Pause(player)
+                           : code == VELMPLAY_NOTIFY_RESUME ? VELMPLAY_Resume(player)
+                                                            : VELMPLAY_Stop(player);
+        EXPECT_EQ(result, 0) << code;
+        EXPECT_EQ(VELMPLAY_GetStatus(player), 0) << code;
+    }
+    BLNOTIFY_DelHandler(VELMAUDIO_Dispatcher(doc), destroy, &doom);
+}
+
 TEST_F(PlayerTest, TheSameDeviceIsKept)
 {
     VELMAUDIO doc = Open(1, 4.0);
