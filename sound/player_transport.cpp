@@ -111,6 +111,8 @@ int VELMPLAY_Stop(VELMPLAYER handle)
     if (!agreed(p, VELMPLAY_NOTIFY_STOP)) return 0;
     if (p->movesCursors() && p->moveCursorOnStop && VELMAUDIO_GetCursorPosition(p->doc) == p->cursorAtStart)
         VELMAUDIO_SetCursorPosition(p->doc, position(p));
+    // A handler of the cursor's move may have ended the player already.
+    if (!live(handle)) return 1;
     VELMSOUND_Stop(p->stream);
     p->status = VELMPLAY_STATUS_STOPPED;
     return 1;

@@ -362,6 +362,26 @@ TEST_F(PlayerTest, AHandlerMayDestroyThePlayerItIsToldAbout)
     BLNOTIFY_DelHandler(VELMAUDIO_Dispatcher(doc), destroy, &doom);
 }
 
+TEST_F(PlayerTest, AHandlerOfTheCursorMovedByStopMayDestroyThePlayer)
+{
+    soundtest::Setting move{"libvelm.playback.movecursoronstop", "1"};
+    VELMAUDIO doc = Open(1, 4.0);
+    ASSERT_NE(doc, nullptr);
+    VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_NE(player, nullptr);
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    // Stopping away from the start moves the cursor, and so tells the shell.
+    ASSERT_TRUE(soundtest::WaitFor([&] { return VELMPLAY_PlayPosition(player) > 0; }));
+    auto destroy = [](const BLNotifyEvent *event, void *user) {
+        if (event->event == 0x2001C) VELMPLAY_DestroyPlayer(static_cast<VELMPLAYER>(user));
+        return 1;
+    };
+    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), destroy, player);
+    EXPECT_TRUE(VELMPLAY_Stop(player));
+    EXPECT_EQ(VELMPLAY_GetStatus(player), 0);
+    BLNOTIFY_DelHandler(VELMAUDIO_Dispatcher(doc), destroy, player);
+}
+
 TEST_F(PlayerTest, TheSameDeviceIsKept)
 {
     VELMAUDIO doc = Open(1, 4.0);
