@@ -92,9 +92,11 @@ int VELMRECORD_Start(VELMRECORDER r, const char *undo_label)
 
 int VELMRECORD_Stop(VELMRECORDER r)
 {
-    if (!velm::recorder_alive(r) || r->status != VELMRECORD_STATUS_RECORDING || !r->stream) return 0;
+    // A recording whose device change failed has no stream left, yet must
+    // still end, or its document could never record again.
+    if (!velm::recorder_alive(r) || r->status != VELMRECORD_STATUS_RECORDING) return 0;
     if (!announce(r, VELMRECORD_NOTIFY_STOP)) return 0;
-    VELMSOUND_Stop(r->stream);
+    if (r->stream) VELMSOUND_Stop(r->stream);
     if (r->timer) {
         VELMTIMER_KillTimer(r->timer);
         r->timer = nullptr;
