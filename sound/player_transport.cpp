@@ -175,6 +175,8 @@ int VELMPLAY_ChangeDevice(VELMPLAYER handle, const char *device_name)
 {
     Player *p = live(handle);
     if (!p || !device_name || !p->stream) return 0;
+    // Only a running or paused player moves: a stopped one is never restarted.
+    if (p->status != VELMPLAY_STATUS_PLAYING && p->status != VELMPLAY_STATUS_OPENED) return 0;
     _audio_format format = p->effect.valid ? p->effect.format : p->source.format;
     format.bitsPerSample = 16;
     VELMSOUNDDEVICE device = VELMSOUND_SelectPlaybackDevice(VELMSOUND_GetSoundDeviceByName(device_name, 0), &format);

@@ -382,6 +382,20 @@ TEST_F(PlayerTest, AHandlerOfTheCursorMovedByStopMayDestroyThePlayer)
     BLNOTIFY_DelHandler(VELMAUDIO_Dispatcher(doc), destroy, player);
 }
 
+TEST_F(PlayerTest, AStoppedPlayerIsNotRestartedOnAnotherDevice)
+{
+    soundtest::Plugged test_device{"libvelm.sound.testdevice", "1"};
+    VELMAUDIO doc = Open(1, 4.0);
+    ASSERT_NE(doc, nullptr);
+    VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    ASSERT_TRUE(VELMPLAY_Stop(player));
+    EXPECT_FALSE(VELMPLAY_ChangeDevice(player, "Audio IO Test Device"));
+    EXPECT_EQ(VELMPLAY_GetStatus(player), VELMPLAY_STATUS_STOPPED);
+    EXPECT_FALSE(VELMPLAY_IsPlaying(player));
+    EXPECT_TRUE(VELMPLAY_DestroyPlayer(player));
+}
+
 TEST_F(PlayerTest, TheSameDeviceIsKept)
 {
     VELMAUDIO doc = Open(1, 4.0);
