@@ -1,6 +1,7 @@
 // Starting, stopping, pausing and resuming a player, waiting for it, moving
 // its read position and changing its device.
 #include <algorithm>
+#include <cstdint>
 
 #include "core/document_internal.hpp"
 #include "core/velmnavigation.h"
@@ -168,7 +169,10 @@ int VELMPLAY_Offset(VELMPLAYER handle, int64_t delta)
         std::lock_guard guard(p->lock);
         from = p->requestedPosition >= 0 ? p->requestedPosition : p->readPosition;
     }
-    return move_to(p, from + delta);
+    // An offset past either end lands on it rather than wrapping around.
+    int64_t to = 0;
+    if (__builtin_add_overflow(from, delta, &to)) to = delta > 0 ? INT64_MAX : INT64_MIN;
+    return move_to(p, to);
 }
 
 int VELMPLAY_ChangeDevice(VELMPLAYER handle, const char *device_name)

@@ -396,6 +396,33 @@ TEST_F(PlayerTest, AStoppedPlayerIsNotRestartedOnAnotherDevice)
     EXPECT_TRUE(VELMPLAY_DestroyPlayer(player));
 }
 
+TEST_F(PlayerTest, MovesBeyondTheEndsStopThere)
+{
+    VELMAUDIO doc = Open(1, 1.0);
+    ASSERT_NE(doc, nullptr);
+    ASSERT_TRUE(VELMAUDIO_SetDrawOption(doc, kVisible));
+    VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_NE(player, nullptr);
+    EXPECT_FALSE(VELMPLAY_Goto(nullptr, 0));
+    EXPECT_FALSE(VELMPLAY_Offset(nullptr, 0));
+    // The largest offsets land on the ends, whatever the position was.
+    ASSERT_TRUE(VELMPLAY_Goto(player, 3000));
+    ASSERT_TRUE(VELMPLAY_Offset(player, INT64_MAX));
+    ASSERT_TRUE(VELMPLAY_Offset(player, -1000));
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    ASSERT_TRUE(soundtest::WaitFor([&] { return VELMPLAY_GetStatus(player) == 0; }));
+    EXPECT_TRUE(Holds(Played(), 0, Samples(doc, 7000, 1000)));
+
+    player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_NE(player, nullptr);
+    ASSERT_TRUE(VELMPLAY_Goto(player, INT64_MIN));
+    ASSERT_TRUE(VELMPLAY_Offset(player, INT64_MIN));
+    ASSERT_TRUE(VELMPLAY_Offset(player, 2000));
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    ASSERT_TRUE(soundtest::WaitFor([&] { return VELMPLAY_GetStatus(player) == 0; }));
+    EXPECT_TRUE(Holds(Played(), 0, Samples(doc, 2000, 6000)));
+}
+
 TEST_F(PlayerTest, TheSameDeviceIsKept)
 {
     VELMAUDIO doc = Open(1, 4.0);
