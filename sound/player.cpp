@@ -168,10 +168,11 @@ int VELMPLAY_DestroyPlayer(VELMPLAYER handle)
     }
     if (p->stream && VELMSOUND_IsPlaying(p->stream)) VELMSOUND_Stop(p->stream);
     if (p->notifies()) announce(p, VELMPLAY_NOTIFY_DESTROYED, handle, nullptr);
-    if (p->file) AUDIO_CloseFile(p->file);
-    // Closing the stream ends the device thread: nothing calls back after it.
+    // Closing the stream ends the device thread: nothing calls back after
+    // it, so only then may the file it reads from go.
     const int closed = p->stream ? VELMSOUND_Close(p->stream) : 0;
     p->stream = nullptr;
+    if (p->file) AUDIO_CloseFile(p->file);
     p->status = VELMPLAY_STATUS_CLOSED;
     destroy_path(p);
     BLMEM_DisposeMemDescr(p->memory);

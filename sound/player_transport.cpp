@@ -1,6 +1,7 @@
 // Starting, stopping, pausing and resuming a player, waiting for it, moving
 // its read position and changing its device.
 #include <algorithm>
+#include <cstdint>
 
 #include "core/document_internal.hpp"
 #include "core/velmnavigation.h"
@@ -45,6 +46,15 @@ bool path_fits_device(const Player *p)
            p->last->format.numChannels == p->outputFormat.numChannels;
 }
 
+// Whether the shell lets the step go ahead: false when a handler refused,
+// or destroyed the player meanwhile.
+bool agreed(Player *p, uint32_t event)
+{
+    const VELMPLAYER handle = to_handle(p);
+    if (!p->announces()) return true;
+    return announce(p, event, handle, nullptr) && live(handle);
+}
+
 int move_to(Player *p, int64_t requested)
 {
     if (!p->doc) return 0;
@@ -73,7 +83,7 @@ int VELMPLAY_Start(VELMPLAYER handle)
         p->status = VELMPLAY_STATUS_FAILED;
         return 0;
     }
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_START, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_START)) return 0;
     p->device = device;
     p->outputFormat = format;
     rebuild_path(p);
@@ -99,9 +109,11 @@ int VELMPLAY_Stop(VELMPLAYER handle)
     Player *p = live(handle);
     if (!p || !p->stream) return 0;
     if (p->status != VELMPLAY_STATUS_PLAYING && p->status != VELMPLAY_STATUS_OPENED) return 0;
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_STOP, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_STOP)) return 0;
     if (p->movesCursors() && p->moveCursorOnStop && VELMAUDIO_GetCursorPosition(p->doc) == p->cursorAtStart)
         VELMAUDIO_SetCursorPosition(p->doc, position(p));
+    // A handler of the cursor's move may have ended the player already.
+    if (!live(handle)) return 1;
     VELMSOUND_Stop(p->stream);
     p->status = VELMPLAY_STATUS_STOPPED;
     return 1;
@@ -111,7 +123,7 @@ int VELMPLAY_Pause(VELMPLAYER handle)
 {
     Player *p = live(handle);
     if (!p || p->status != VELMPLAY_STATUS_PLAYING) return 0;
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_PAUSE, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_PAUSE)) return 0;
     if (!VELMSOUND_Pause(p->stream)) return 0;
     p->status = VELMPLAY_STATUS_OPENED;
     return 1;
@@ -121,7 +133,7 @@ int VELMPLAY_Resume(VELMPLAYER handle)
 {
     Player *p = live(handle);
     if (!p || p->status != VELMPLAY_STATUS_OPENED || !p->stream) return 0;
-    if (p->announces() && !announce(p, VELMPLAY_NOTIFY_RESUME, handle, nullptr)) return 0;
+    if (!agreed(p, VELMPLAY_NOTIFY_RESUME)) return 0;
     if (!VELMSOUND_Start(p->stream)) return 0;
     p->status = VELMPLAY_STATUS_PLAYING;
     return 1;
@@ -157,13 +169,18 @@ int VELMPLAY_Offset(VELMPLAYER handle, int64_t delta)
         std::lock_guard guard(p->lock);
         from = p->requestedPosition >= 0 ? p->requestedPosition : p->readPosition;
     }
-    return move_to(p, from + delta);
+    // An offset past either end lands on it rather than wrapping around.
+    int64_t to = 0;
+    if (__builtin_add_overflow(from, delta, &to)) to = delta > 0 ? INT64_MAX : INT64_MIN;
+    return move_to(p, to);
 }
 
 int VELMPLAY_ChangeDevice(VELMPLAYER handle, const char *device_name)
 {
     Player *p = live(handle);
     if (!p || !device_name || !p->stream) return 0;
+    // Only a running or paused player moves: a stopped one is never restarted.
+    if (p->status != VELMPLAY_STATUS_PLAYING && p->status != VELMPLAY_STATUS_OPENED) return 0;
     _audio_format format = p->effect.valid ? p->effect.format : p->source.format;
     format.bitsPerSample = 16;
     VELMSOUNDDEVICE device = VELMSOUND_SelectPlaybackDevice(VELMSOUND_GetSoundDeviceByName(device_name, 0), &format);

@@ -155,7 +155,7 @@ int VELMRECORD_DestroyRecorder(VELMRECORDER r)
 
 int64_t VELMRECORD_RecordPosition(VELMRECORDER r)
 {
-    if (!r || r->status != VELMRECORD_STATUS_RECORDING) return -1;
+    if (!velm::recorder_alive(r) || r->status != VELMRECORD_STATUS_RECORDING) return -1;
     MutexLock(r->lock);
     const int64_t position = r->position;
     MutexUnlock(r->lock);
@@ -164,17 +164,17 @@ int64_t VELMRECORD_RecordPosition(VELMRECORDER r)
 
 int VELMRECORD_GetStatus(VELMRECORDER r)
 {
-    return r ? r->status : VELMRECORD_STATUS_CLOSED;
+    return velm::recorder_alive(r) ? r->status : VELMRECORD_STATUS_CLOSED;
 }
 
 int VELMRECORD_IsRecording(VELMRECORDER r)
 {
-    return r && r->stream && VELMSOUND_IsCapturing(r->stream) ? 1 : 0;
+    return velm::recorder_alive(r) && r->stream && VELMSOUND_IsCapturing(r->stream) ? 1 : 0;
 }
 
 int VELMRECORD_SetGUITimer(VELMRECORDER r, VELMTIMER_Callback callback, void *user)
 {
-    if (!r || r->timer) return 0;
+    if (!velm::recorder_alive(r) || r->timer) return 0;
     r->updateCallback = callback;
     r->updateUser = user;
     return 1;

@@ -58,7 +58,7 @@ bool recorder_make_conversion(VELMRECORDER r)
 
 int VELMRECORD_Start(VELMRECORDER r, const char *undo_label)
 {
-    if (!r || r->stream || !r->doc || !VELMAUDIO_GetAudioSignal(r->doc)) return 0;
+    if (!velm::recorder_alive(r) || r->stream || !r->doc || !VELMAUDIO_GetAudioSignal(r->doc)) return 0;
     VELMAUDIO_GetSignalFormat(&r->signalFormat, r->doc);
     const char *name = BLSETTINGS_GetStringEx(nullptr, "libvelm.record.devicename=[%s]", "default");
     r->device = select_device(r, name, &r->captureFormat);
@@ -92,9 +92,11 @@ int VELMRECORD_Start(VELMRECORDER r, const char *undo_label)
 
 int VELMRECORD_Stop(VELMRECORDER r)
 {
-    if (!r || r->status != VELMRECORD_STATUS_RECORDING || !r->stream) return 0;
+    // A recording whose device change failed has no stream left, yet must
+    // still end, or its document could never record again.
+    if (!velm::recorder_alive(r) || r->status != VELMRECORD_STATUS_RECORDING) return 0;
     if (!announce(r, VELMRECORD_NOTIFY_STOP)) return 0;
-    VELMSOUND_Stop(r->stream);
+    if (r->stream) VELMSOUND_Stop(r->stream);
     if (r->timer) {
         VELMTIMER_KillTimer(r->timer);
         r->timer = nullptr;
@@ -107,7 +109,7 @@ int VELMRECORD_Stop(VELMRECORDER r)
 
 int VELMRECORD_ChangeDevice(VELMRECORDER r, const char *device_name)
 {
-    if (!r || !device_name || r->status != VELMRECORD_STATUS_RECORDING) return 0;
+    if (!velm::recorder_alive(r) || !device_name || r->status != VELMRECORD_STATUS_RECORDING) return 0;
     _audio_format format;
     VELMSOUNDDEVICE device = select_device(r, device_name, &format);
     if (!device) return 0;

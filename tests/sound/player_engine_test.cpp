@@ -236,6 +236,22 @@ TEST_F(PlayerTest, AFilePlayerPlaysAFile)
     for (size_t i = 0; i < tone.size(); ++i) ASSERT_NEAR(played[i], tone[i], 1.5 / 32768) << i;
 }
 
+TEST_F(PlayerTest, AFilePlayerDestroyedWhileTheDeviceReadsLetsTheDeviceFinishFirst)
+{
+    // A long device buffer keeps the device thread reading the file while
+    // the player goes away.
+    soundtest::Setting buffer{"libvelm.playback.osbuffersize", "4"};
+    const std::string path = dir.file("long.wav");
+    ASSERT_TRUE(velmtest::write_audio(path, velmtest::sine(kRate, 2, kRate * 40, 300.0, 0.4), kRate, 2));
+    for (int round = 0; round < 8; ++round) {
+        VELMPLAYER player = VELMPLAY_CreateFilePlayer(path.c_str(), "AUTO", 0);
+        ASSERT_NE(player, nullptr);
+        ASSERT_TRUE(VELMPLAY_Start(player));
+        EXPECT_TRUE(VELMPLAY_DestroyPlayer(player));
+        EXPECT_EQ(VELMPLAY_GetStatus(player), 0);
+    }
+}
+
 TEST_F(PlayerTest, WaitingRunsTheUpdatesUntilTheEnd)
 {
     VELMAUDIO doc = Open(1, 4.0);
@@ -313,6 +329,98 @@ TEST_F(PlayerTest, ADestroyedPlayerIsRefused)
     EXPECT_EQ(VELMPLAY_GetStatus(mine), VELMPLAY_STATUS_CREATED);
     EXPECT_FALSE(VELMPLAY_SetChannelMask(nullptr, 0x3));
     EXPECT_FALSE(VELMPLAY_ChangeDevice(nullptr, "Virtual Device"));
+}
+
+TEST_F(PlayerTest, AHandlerMayDestroyThePlayerItIsToldAbout)
+{
+    VELMAUDIO doc = Open(1, 4.0);
+    ASSERT_NE(doc, nullptr);
+    struct Doom {
+        uint32_t code;
+    } doom{0};
+    auto destroy = [](const BLNotifyEvent *event, void *user) {
+        if (event->event == static_cast<Doom *>(user)->code)
+            VELMPLAY_DestroyPlayer(static_cast<VELMPLAYER>(event->data1));
+        return 1;
+    };
+    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), destroy, &doom);
+    // Each call fails once its announcement took the player away.
+    for (uint32_t code : {VELMPLAY_NOTIFY_START, VELMPLAY_NOTIFY_PAUSE, VELMPLAY_NOTIFY_RESUME, VELMPLAY_NOTIFY_STOP}) {
+        doom.code = 0;
+        VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+        ASSERT_NE(player, nullptr);
+        if (code != VELMPLAY_NOTIFY_START) ASSERT_TRUE(VELMPLAY_Start(player));
+        if (code == VELMPLAY_NOTIFY_RESUME) ASSERT_TRUE(VELMPLAY_Pause(player));
+        doom.code = code;
+        const int result = code == VELMPLAY_NOTIFY_START   ? VELMPLAY_Start(player)
+                           : code == VELMPLAY_NOTIFY_PAUSE ? VELMPLAY_Pause(player)
+                           : code == VELMPLAY_NOTIFY_RESUME ? VELMPLAY_Resume(player)
+                                                            : VELMPLAY_Stop(player);
+        EXPECT_EQ(result, 0) << code;
+        EXPECT_EQ(VELMPLAY_GetStatus(player), 0) << code;
+    }
+    BLNOTIFY_DelHandler(VELMAUDIO_Dispatcher(doc), destroy, &doom);
+}
+
+TEST_F(PlayerTest, AHandlerOfTheCursorMovedByStopMayDestroyThePlayer)
+{
+    soundtest::Setting move{"libvelm.playback.movecursoronstop", "1"};
+    VELMAUDIO doc = Open(1, 4.0);
+    ASSERT_NE(doc, nullptr);
+    VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_NE(player, nullptr);
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    // Stopping away from the start moves the cursor, and so tells the shell.
+    ASSERT_TRUE(soundtest::WaitFor([&] { return VELMPLAY_PlayPosition(player) > 0; }));
+    auto destroy = [](const BLNotifyEvent *event, void *user) {
+        if (event->event == 0x2001C) VELMPLAY_DestroyPlayer(static_cast<VELMPLAYER>(user));
+        return 1;
+    };
+    BLNOTIFY_AddHandler(VELMAUDIO_Dispatcher(doc), destroy, player);
+    EXPECT_TRUE(VELMPLAY_Stop(player));
+    EXPECT_EQ(VELMPLAY_GetStatus(player), 0);
+    BLNOTIFY_DelHandler(VELMAUDIO_Dispatcher(doc), destroy, player);
+}
+
+TEST_F(PlayerTest, AStoppedPlayerIsNotRestartedOnAnotherDevice)
+{
+    soundtest::Plugged test_device{"libvelm.sound.testdevice", "1"};
+    VELMAUDIO doc = Open(1, 4.0);
+    ASSERT_NE(doc, nullptr);
+    VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    ASSERT_TRUE(VELMPLAY_Stop(player));
+    EXPECT_FALSE(VELMPLAY_ChangeDevice(player, "Audio IO Test Device"));
+    EXPECT_EQ(VELMPLAY_GetStatus(player), VELMPLAY_STATUS_STOPPED);
+    EXPECT_FALSE(VELMPLAY_IsPlaying(player));
+    EXPECT_TRUE(VELMPLAY_DestroyPlayer(player));
+}
+
+TEST_F(PlayerTest, MovesBeyondTheEndsStopThere)
+{
+    VELMAUDIO doc = Open(1, 1.0);
+    ASSERT_NE(doc, nullptr);
+    ASSERT_TRUE(VELMAUDIO_SetDrawOption(doc, kVisible));
+    VELMPLAYER player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_NE(player, nullptr);
+    EXPECT_FALSE(VELMPLAY_Goto(nullptr, 0));
+    EXPECT_FALSE(VELMPLAY_Offset(nullptr, 0));
+    // The largest offsets land on the ends, whatever the position was.
+    ASSERT_TRUE(VELMPLAY_Goto(player, 3000));
+    ASSERT_TRUE(VELMPLAY_Offset(player, INT64_MAX));
+    ASSERT_TRUE(VELMPLAY_Offset(player, -1000));
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    ASSERT_TRUE(soundtest::WaitFor([&] { return VELMPLAY_GetStatus(player) == 0; }));
+    EXPECT_TRUE(Holds(Played(), 0, Samples(doc, 7000, 1000)));
+
+    player = VELMPLAY_CreatePlayer(doc, 0);
+    ASSERT_NE(player, nullptr);
+    ASSERT_TRUE(VELMPLAY_Goto(player, INT64_MIN));
+    ASSERT_TRUE(VELMPLAY_Offset(player, INT64_MIN));
+    ASSERT_TRUE(VELMPLAY_Offset(player, 2000));
+    ASSERT_TRUE(VELMPLAY_Start(player));
+    ASSERT_TRUE(soundtest::WaitFor([&] { return VELMPLAY_GetStatus(player) == 0; }));
+    EXPECT_TRUE(Holds(Played(), 0, Samples(doc, 2000, 6000)));
 }
 
 TEST_F(PlayerTest, TheSameDeviceIsKept)

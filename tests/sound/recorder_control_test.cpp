@@ -4,6 +4,7 @@
 #include "edit/velmedit.h"
 #include "edit/velmundo.h"
 #include "recorder_support.hpp"
+#include "sound_support.hpp"
 
 namespace {
 
@@ -152,6 +153,29 @@ TEST_F(RecordControl, AVetoedStopKeepsRecording)
     EXPECT_EQ(VELMAUDIO_IsRecording(doc), 1);
     const int64_t now = VELMRECORD_RecordPosition(r);
     EXPECT_TRUE(record_until(r, now + 1000));
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+}
+
+TEST_F(RecordControl, ARecordingWhoseDeviceChangeFailedCanBeStopped)
+{
+    // A test device that offers only 50 Hz, too slow for one frame per
+    // buffer time: its stream cannot open.
+    soundtest::Setting buffer{"libvelm.record.osbuffersize", "0.005"};
+    soundtest::Setting formats{"libvelm.sound.test.captureformats", std::to_string(0x41300000)};
+    soundtest::Setting rate{"libvelm.sound.test.maxrate", "50"};
+    soundtest::Plugged test_device{"libvelm.sound.testdevice", "1"};
+    VELMAUDIO doc = document(kRate, 1);
+    ASSERT_NE(doc, nullptr);
+    VELMRECORDER r = VELMAUDIO_RecordStart(doc, 0, nullptr);
+    ASSERT_NE(r, nullptr);
+    ASSERT_TRUE(record_until(r, 1000));
+    EXPECT_EQ(VELMRECORD_ChangeDevice(r, "Audio IO Test Device"), 0);
+    EXPECT_EQ(VELMRECORD_IsRecording(r), 0);
+    // What was recorded stays, and the document can record again.
+    EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
+    EXPECT_GE(VELMAUDIO_NumSamples(doc), 1000);
+    EXPECT_NE(VELMAUDIO_RecordStart(doc, 0, nullptr), nullptr);
     EXPECT_EQ(VELMAUDIO_RecordStop(doc), 1);
 }
 
@@ -340,6 +364,15 @@ TEST_F(RecordControl, RefusedRequests)
     EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 1);
     EXPECT_EQ(VELMRECORD_DestroyRecorder(r), 0);
     EXPECT_EQ(destroyed.count, 0);
+    // A destroyed recorder's handle is refused like a null one.
+    EXPECT_EQ(VELMRECORD_GetStatus(r), VELMRECORD_STATUS_CLOSED);
+    EXPECT_EQ(VELMRECORD_IsRecording(r), 0);
+    EXPECT_EQ(VELMRECORD_RecordPosition(r), -1);
+    EXPECT_EQ(VELMRECORD_Start(r, nullptr), 0);
+    EXPECT_EQ(VELMRECORD_Stop(r), 0);
+    EXPECT_EQ(VELMRECORD_ChangeDevice(r, "Virtual Device"), 0);
+    EXPECT_EQ(VELMRECORD_SetGUITimer(r, nullptr, nullptr), 0);
+    EXPECT_EQ(VELMAUDIO_IsRecording(doc), 0);
 
     VELMAUDIO_SetEditable(doc, 0);
     EXPECT_EQ(VELMAUDIO_RecordStart(doc, 0, nullptr), nullptr);
