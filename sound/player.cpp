@@ -37,10 +37,18 @@ int dispose_player(void *object)
     return VELMPLAY_DestroyPlayer(static_cast<VELMPLAYER>(object));
 }
 
+// The device buffer time: at least 5 ms, and no longer than a stream
+// accepts, so that an odd setting still plays instead of failing to open.
+double buffer_time_setting()
+{
+    const double t = BLSETTINGS_GetFloatEx(nullptr, "libvelm.playback.osbuffersize=[%f]", 0.05);
+    return std::isfinite(t) ? std::clamp(t, 0.005, 2.0) : 0.05;
+}
+
 void read_settings(Player *p)
 {
     p->moveCursorOnStop = BLSETTINGS_GetIntEx(nullptr, "libvelm.playback.movecursoronstop=[%d]", 0) != 0;
-    p->deviceBufferTime = std::max(BLSETTINGS_GetFloatEx(nullptr, "libvelm.playback.osbuffersize=[%f]", 0.05), 0.005);
+    p->deviceBufferTime = buffer_time_setting();
     p->loopOnSelection = BLSETTINGS_GetIntEx(nullptr, "libvelm.playback.looponaudioselection=[%d]", 0) != 0;
     p->followCursor = BLSETTINGS_GetIntEx(nullptr, "libvelm.playback.followcursor=[%d]", 1) != 0;
 }

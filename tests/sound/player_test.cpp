@@ -39,6 +39,20 @@ TEST_F(PlayerTest, ASelectionComesOutOfTheDeviceAsItIsStored)
     EXPECT_FALSE(VELMAUDIO_PlayCursorVisible(doc));
 }
 
+TEST_F(PlayerTest, AnAbsurdDeviceBufferSettingStillPlays)
+{
+    VELMAUDIO doc = Open(1, 0.5);
+    ASSERT_NE(doc, nullptr);
+    for (const char *absurd : {"3600", "nan", "-1"}) {
+        soundtest::Setting buffer{"libvelm.playback.osbuffersize", absurd};
+        ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 1000, 3000)) << absurd;
+        ASSERT_TRUE(VELMAUDIO_PlayStart(doc, VELMPLAY_MODE_SELECTIONS, 0, 0)) << absurd;
+        EXPECT_EQ(VELMAUDIO_GetPlayStatus(doc), VELMPLAY_STATUS_PLAYING) << absurd;
+        ASSERT_TRUE(Gone(doc)) << absurd;
+        EXPECT_TRUE(Holds(Played(), 0, Samples(doc, 1000, 2000))) << absurd;
+    }
+}
+
 TEST_F(PlayerTest, TwoSelectionsPlayAsTwoBlocksAndEnd)
 {
     VELMAUDIO doc = Open(2, 1.0);
