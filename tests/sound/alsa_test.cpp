@@ -111,3 +111,24 @@ TEST_F(AlsaNull, LeavesTheListWhenNoLongerNamed)
 }
 
 } // namespace
+
+namespace {
+
+// A PCM whose writes fail now and then: the stream still comes to an end.
+TEST(AlsaFailing, AStreamWhoseWritesFailStillEnds)
+{
+    Plugged pcms{"libvelm.sound.alsa.devices", "null,file:FILE=/dev/full"};
+    VELMSOUND_UpdateDeviceList();
+    VELMSOUNDDEVICE device = VELMSOUND_GetSoundDeviceByName("file:FILE=/dev/full", 0);
+    ASSERT_NE(device, nullptr);
+    ToneSource source(Tone(44100, 2, 0.3));
+    _audio_format format = Format(44100, 2);
+    ASSERT_EQ(VELMSOUND_SelectPlaybackDevice(device, &format), device);
+    VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(device, 0.05f, &ToneSource::Fill, &source, &format);
+    ASSERT_NE(stream, nullptr);
+    ASSERT_TRUE(VELMSOUND_Start(stream));
+    EXPECT_TRUE(WaitFor([&] { return !VELMSOUND_IsPlaying(stream); }));
+    EXPECT_TRUE(VELMSOUND_Close(stream));
+}
+
+} // namespace
