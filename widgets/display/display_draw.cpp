@@ -63,7 +63,7 @@ void draw_digits(VELMCANVAS canvas, const _VELMDISPLAY *d)
     if (display_is_sample_unit(s.unit)) {
         VELMDRAWCOMMON_DrawDisplaySample(canvas, &font, s.options, x, y, position);
     } else if (display_is_frame_unit(s.unit)) {
-        const int64_t length = d->doc ? VELMAUDIO_ScaleFrameLength(d->doc) : 0;
+        const int64_t length = display_has_doc(d) ? VELMAUDIO_ScaleFrameLength(d->doc) : 0;
         const int64_t frame = length > 0 ? position / length : 0;
         const int64_t offset = length > 0 ? position % length : 0;
         VELMDRAWCOMMON_DrawDisplayFrame(canvas, &font, s.options, x, y, frame, offset);
