@@ -123,7 +123,9 @@ void draw_data(_VELMGRAPHDRAW *d, const VELMGRAPHSTATE &st, const Settings &s, V
 {
     const int columns = d->right - d->left + 1;
     std::vector<float> xs(columns), ys(columns);
-    std::vector<int> px(columns + 4), py(columns + 4);
+    /* The canvas fills an envelope: the curve left to right, then the
+     * baseline below the plot back from right to left. */
+    std::vector<int> px(2 * columns), py(2 * columns);
     int slot = 0;
     for (const auto &set : d->graph->sets) {
         if (set->kind != VELMGRAPH_KIND_REAL || set->count < 1) continue;
@@ -134,14 +136,12 @@ void draw_data(_VELMGRAPHDRAW *d, const VELMGRAPHSTATE &st, const Settings &s, V
             continue;
         for (int i = 0; i < columns; ++i) {
             px[i] = d->left + i;
-            py[i] = std::clamp(graph_real_to_display_y(d, ys[i]), d->top - 1, d->bottom + 1);
+            py[i] = std::clamp(graph_real_to_display_y(d, ys[i]), d->top, d->bottom + 1);
+            px[2 * columns - 1 - i] = d->left + i;
+            py[2 * columns - 1 - i] = d->bottom + 1;
         }
-        px[columns] = d->right + 1, py[columns] = py[columns - 1];
-        px[columns + 1] = d->right + 1, py[columns + 1] = d->bottom + 1;
-        px[columns + 2] = d->left - 1, py[columns + 2] = d->bottom + 1;
-        px[columns + 3] = d->left - 1, py[columns + 3] = py[0];
         VELMCANVAS_SelectColor(canvas, s.contour[slot]);
-        VELMCANVAS_DrawPolygon(canvas, px.data(), py.data(), columns + 4, s.fill[slot]);
+        VELMCANVAS_DrawPolygon(canvas, px.data(), py.data(), 2 * columns, s.fill[slot]);
         VELMCANVAS_DrawPolyline(canvas, px.data(), py.data(), columns);
         slot = (slot + 1) % kColorSlots;
     }
@@ -153,9 +153,10 @@ void draw_overlays(_VELMGRAPHDRAW *d, const VELMGRAPHSTATE &st, const Settings &
     if (sel[2] - sel[0] != 0 || sel[3] - sel[1] != 0) {
         const int x0 = graph_real_to_display_x(d, sel[0]), x1 = graph_real_to_display_x(d, sel[2]);
         const int y0 = graph_real_to_display_y(d, sel[3]), y1 = graph_real_to_display_y(d, sel[1]);
-        VELMCANVAS_SelectColor(canvas, 0x40FFFFFF);
-        VELMCANVAS_FillRect(canvas, x0, y0, x1 - x0 + 1, y1 - y0 + 1, VELMCANVASRECTOPT_GRADIENTALPHA);
         VELMCANVAS_SelectColor(canvas, s.track);
+        const float previous = VELMCANVAS_SetAlphaFactor(canvas, 0.25f);
+        VELMCANVAS_FillRect(canvas, x0, y0, x1 - x0 + 1, y1 - y0 + 1, 0);
+        VELMCANVAS_SetAlphaFactor(canvas, previous);
         VELMCANVAS_BorderRect(canvas, x0, y0, x1 - x0 + 1, y1 - y0 + 1, 0);
     }
     if (st.trackEnabled && st.trackVisible && st.trackX >= d->left && st.trackX <= d->right &&
