@@ -235,14 +235,11 @@ VELMGRAPHDRAW VELMGRAPHDRAW_Create(VELMGRAPH graph)
     if (!graph) return nullptr;
     auto *d = new _VELMGRAPHDRAW;
     d->graph = graph;
-    d->pool = BLMEM_CreateMemDescrEx("GraphDisplayData Memory", 0, 0);
     return d;
 }
 
 void graph_destroy_drawer(VELMGRAPHDRAW drawer)
 {
-    if (!drawer) return;
-    if (drawer->pool) BLMEM_DisposeMemDescr(drawer->pool);
     delete drawer;
 }
 

@@ -22,7 +22,6 @@ struct GraphAxisLimits {
 };
 
 struct _VELMGRAPH {
-    BLMEM pool = nullptr;
     VELMGRAPHSTATE state{};
     bool autoScale[2] = {true, false};
     GraphAxisLimits hard[2];
@@ -36,7 +35,6 @@ struct _VELMGRAPH {
 /* Plot layout and interaction state, kept by the drawer between draws. */
 struct _VELMGRAPHDRAW {
     VELMGRAPH graph = nullptr;
-    BLMEM pool = nullptr;
     VELMGRAPHSTATE lastDrawn{};
     bool drawnOnce = false;
     int width = 0, height = 0;

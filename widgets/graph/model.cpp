@@ -21,13 +21,8 @@ void copy_text(char *field, size_t size, const char *text)
 VELMGRAPH VELMGRAPH_Create(void)
 {
     auto graph = std::make_unique<_VELMGRAPH>();
-    graph->pool = BLMEM_CreateMemDescrEx("VELMGRAPH Memory", 0, 0);
     graph->dispatcher = BLNOTIFY_CreateDispatcher(graph.get());
-    if (!graph->pool || !graph->dispatcher) {
-        if (graph->dispatcher) BLNOTIFY_DestroyDispatcher(graph->dispatcher);
-        if (graph->pool) BLMEM_DisposeMemDescr(graph->pool);
-        return nullptr;
-    }
+    if (!graph->dispatcher) return nullptr;
     VELMGRAPHSTATE_Reset(&graph->state);
     const double inf = std::numeric_limits<double>::infinity();
     graph->hard[0] = graph->hard[1] = {-inf, inf};
@@ -41,7 +36,6 @@ int VELMGRAPH_Destroy(VELMGRAPH graph)
     if (!graph) return 0;
     graph_destroy_drawer(graph->drawer);
     BLNOTIFY_DestroyDispatcher(graph->dispatcher);
-    BLMEM_DisposeMemDescr(graph->pool);
     delete graph;
     return 1;
 }

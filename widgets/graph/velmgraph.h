@@ -25,7 +25,7 @@ typedef struct _VELMGRAPHDRAW *VELMGRAPHDRAW;
 #define VELMGRAPH_LABEL_SIZE 256
 #define VELMGRAPH_KIND_REAL 0
 /* Largest sample count a data set accepts. */
-#define VELMGRAPH_MAX_SAMPLES ((int64_t)1 << 26)
+#define VELMGRAPH_MAX_SAMPLES ((int64_t)1 << 24)
 
 /* Mouse-over kinds and events. */
 #define VELMGRAPH_OVER_NONE 0

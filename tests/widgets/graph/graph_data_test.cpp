@@ -159,9 +159,12 @@ TEST(GraphData, IdsOnlyGrowAndListsFollowKindAndOrder)
 {
     Graph g = make_graph();
     EXPECT_EQ(VELMGRAPH_DataSetCount(g.get()), 0);
+    LogCapture log;
     const int a = VELMGRAPH_CreateDataSet(g.get(), 0, 1);
     const int b = VELMGRAPH_CreateDataSet(g.get(), 1, 1);
     const int c = VELMGRAPH_CreateDataSet(g.get(), 0, 1);
+    ASSERT_EQ(log.lines.size(), 3u);
+    EXPECT_NE(log.lines[2].find("Dataset 2 created"), std::string::npos) << log.lines[2];
     EXPECT_EQ(a, 0);
     EXPECT_EQ(b, 1);
     EXPECT_EQ(c, 2);

@@ -168,6 +168,16 @@ TEST(GraphState, ChangesAreRankedByWhatMustBeRedrawn)
     EXPECT_EQ(VELMGRAPHSTATE_Reset(nullptr), 0);
 }
 
+TEST(GraphSettings, DefaultsAreRegisteredWhenTheLibraryStarts)
+{
+    EXPECT_EQ(BLSETTINGS_GetIntEx(nullptr, "libvelm.velmgraph.vertscalewidth=[%d]", -1), 40);
+    EXPECT_EQ(BLSETTINGS_GetIntEx(nullptr, "libvelm.velmgraph.horzscaleheight=[%d]", -1), 20);
+    EXPECT_EQ(static_cast<uint32_t>(BLSETTINGS_GetIntEx(nullptr, "libvelm.velmgraph.fillcolor.2=[0x%08X]", 0)),
+              0xA0EC0098u);
+    EXPECT_STREQ(BLSETTINGS_GetStringEx(nullptr, "libvelm.velmgraph.titlefont.familyname=[%s]", "none"), "Arial");
+    EXPECT_EQ(BLSETTINGS_GetIntEx(nullptr, "libvelm.velmgraph.scalefont.Properties=[%d]", -1), 128);
+}
+
 TEST(GraphScale, TickStepAimsAtFortyPixels)
 {
     EXPECT_DOUBLE_EQ(VELMGRAPHDRAW_TickStep(400, 10.0), 1.0);     // 40 px per unit
