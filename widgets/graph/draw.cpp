@@ -233,9 +233,11 @@ double VELMGRAPHDRAW_TickStep(int pixels, double width)
 VELMGRAPHDRAW VELMGRAPHDRAW_Create(VELMGRAPH graph)
 {
     if (!graph) return nullptr;
-    auto *d = new _VELMGRAPHDRAW;
-    d->graph = graph;
-    return d;
+    if (!graph->drawer) {
+        graph->drawer = new _VELMGRAPHDRAW;
+        graph->drawer->graph = graph;
+    }
+    return graph->drawer;
 }
 
 void graph_destroy_drawer(VELMGRAPHDRAW drawer)
@@ -260,8 +262,6 @@ int VELMGRAPHDRAW_Update(VELMGRAPHDRAW d, VELMGRAPHSTATE *st, VELMCANVAS canvas)
     d->top = s.top + titleHeight;
     d->right = width - 1 - s.right;
     d->bottom = height - 1 - s.bottom - s.hScaleHeight;
-    d->lastDrawn = *st;
-    d->drawnOnce = true;
     st->changed = 0;
 
     VELMCANVAS_SelectColor(canvas, s.bg);
@@ -321,10 +321,9 @@ int graph_real_to_display_y(const _VELMGRAPHDRAW *d, double y)
 int VELMGRAPH_Draw(VELMCANVAS canvas, VELMGRAPH graph)
 {
     if (!canvas || !graph) return 0;
-    if (!graph->drawer) graph->drawer = VELMGRAPHDRAW_Create(graph);
-    if (!graph->drawer) return 0;
+    VELMGRAPHDRAW drawer = VELMGRAPHDRAW_Create(graph);
     graph_recompute_full_ranges(graph);
-    return VELMGRAPHDRAW_Update(graph->drawer, &graph->state, canvas);
+    return VELMGRAPHDRAW_Update(drawer, &graph->state, canvas);
 }
 
 int VELMGRAPH_RedrawNeeded(void) { return 1; }

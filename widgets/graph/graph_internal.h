@@ -35,8 +35,6 @@ struct _VELMGRAPH {
 /* Plot layout and interaction state, kept by the drawer between draws. */
 struct _VELMGRAPHDRAW {
     VELMGRAPH graph = nullptr;
-    VELMGRAPHSTATE lastDrawn{};
-    bool drawnOnce = false;
     int width = 0, height = 0;
     int left = 0, top = 0, right = 0, bottom = 0; /* plot area, inclusive */
     int vScaleWidth = 40, hScaleHeight = 20;

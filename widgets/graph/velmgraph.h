@@ -121,6 +121,8 @@ VELM_API int VELMGRAPH_DisablePositionTrack(VELMGRAPH graph);
 VELM_API int VELMGRAPH_PositionTrackVisible(VELMGRAPH graph, int visible);
 VELM_API int VELMGRAPH_UpdatePositionTrack(VELMGRAPH graph, int x, int y);
 
+/* Draws the whole graph on a painting canvas (full ranges recomputed, views
+ * clamped, the changed flag cleared); mouse input is accepted from then on. */
 VELM_API int VELMGRAPH_Draw(VELMCANVAS canvas, VELMGRAPH graph);
 VELM_API int VELMGRAPH_RedrawNeeded(void);
 VELM_API int VELMGRAPH_AddEventHandler(VELMGRAPH graph, BLNOTIFY_Handler handler, void *user);
@@ -138,7 +140,9 @@ VELM_API int VELMGRAPH_AccKeyDown(VELMGRAPH graph, int keys);
 VELM_API int VELMGRAPH_AccKeyUp(VELMGRAPH graph, int keys);
 
 VELM_API int VELMGRAPHDRAW_SetDefaultSettings(void);
+/* The graph's drawer, made on the first call; owned and destroyed by the graph. */
 VELM_API VELMGRAPHDRAW VELMGRAPHDRAW_Create(VELMGRAPH graph);
+/* Lays out and paints state with the current settings; does not recompute ranges. */
 VELM_API int VELMGRAPHDRAW_Update(VELMGRAPHDRAW drawer, VELMGRAPHSTATE *state, VELMCANVAS canvas);
 /* Tick step of an axis of length pixels showing width units; 0 when either is not positive. */
 VELM_API double VELMGRAPHDRAW_TickStep(int pixels, double width);

@@ -77,6 +77,11 @@ TEST(GraphControl, MouseInputIsRefusedBeforeTheFirstDraw)
     EXPECT_EQ(state(g).trackEnabled, 0);
     draw(g.get());
     EXPECT_EQ(VELMGRAPH_MouseMove(g.get(), 100, 100, 0), 1);
+    // The drawer belongs to the graph: asking again gives the same one.
+    VELMGRAPHDRAW drawer = VELMGRAPHDRAW_Create(g.get());
+    ASSERT_NE(drawer, nullptr);
+    EXPECT_EQ(VELMGRAPHDRAW_Create(g.get()), drawer);
+    EXPECT_EQ(VELMGRAPHDRAW_Update(drawer, nullptr, nullptr), 0);
     EXPECT_EQ(VELMGRAPH_MouseMove(nullptr, 100, 100, 0), 0);
 }
 
