@@ -298,6 +298,7 @@ double graph_display_to_real_y(const _VELMGRAPHDRAW *d, int row)
 namespace {
 int to_pixel(double v)
 {
+    if (std::isnan(v)) return 0;
     return static_cast<int>(std::lround(std::clamp(v, -1e6, 1e6)));
 }
 } // namespace
