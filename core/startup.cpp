@@ -7,6 +7,7 @@
 #include "outside/signal/audioformat.h"
 #include "outside/signal/dspb.h"
 #include "sound/velmsound.h"
+#include "widgets/graph/velmgraph.h"
 
 namespace {
 
@@ -20,6 +21,7 @@ void start_services()
     BLSETTINGS_ChangeEx(nullptr, "dspb.fftw.prepare_plans=1");
     BLVERSION_Register("libvelm", VELM_VERSION_MAJOR, VELM_VERSION_MINOR, VELM_VERSION_RELEASE, VELM_VERSION_BUILD);
     VELMCONFIG_ResetConfiguration();
+    VELMGRAPHDRAW_SetDefaultSettings();
     BLSETTINGS_SetDefaultEx(nullptr, "libvelm.playback.devicename=default");
     BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.devicename=default");
 }
