@@ -95,7 +95,12 @@ TEST_F(Objects, RegionClicksSelectAndDragsMove)
     ASSERT_TRUE(VELMAUDIO_MouseUp(doc, x + 40, y, kPrimary));
     EXPECT_EQ(VELMAUDIO_GetRegionBeginSample(doc, first), 2000 + shift);
     EXPECT_EQ(VELMAUDIO_GetRegionBeginSample(doc, second), 8000);
+    // The whole drag is one undo step.
+    ASSERT_TRUE(VELMAUDIO_Undo(doc));
+    EXPECT_EQ(VELMAUDIO_GetRegionBeginSample(doc, first), 2000);
+    EXPECT_FALSE(VELMAUDIO_Undo(doc));
     // The region's border drags alone.
+    ASSERT_TRUE(VELMAUDIO_OffsetRegions(doc, shift));
     draw();
     const _VELMRECT moved = region_rect(first);
     const int right = moved.left + moved.width - 1;

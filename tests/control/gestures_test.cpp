@@ -257,6 +257,51 @@ TEST_F(Gestures, HoverTimerReportsEachNewPositionOnce)
     EXPECT_EQ(seen, (std::vector<int>{1, 1, 1, 2, 2}));
 }
 
+TEST_F(Gestures, NavigatorPressOutsideTheWindowScrollsTowardIt)
+{
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 0, 2000));
+    draw();
+    const _VELMRECT box = drawer()->overlay.navigatorBox;
+    const _VELMRECT strip = drawer()->navigator;
+    const int x = strip.left + strip.width * 3 / 4, y = box.top + box.height / 2;
+    ASSERT_GT(x, box.left + box.width);
+    std::vector<int64_t> begins;
+    std::thread shell([&] {
+        VELMAUDIO_MouseDown(doc, x, y, kPrimary);
+        for (int i = 0; i < 3; ++i) {
+            pump(50);
+            begins.push_back(VELMAUDIO_ViewBegin(doc));
+        }
+        VELMAUDIO_MouseUp(doc, x, y, kPrimary);
+        pump(50); // released: the repeat is gone
+        begins.push_back(VELMAUDIO_ViewBegin(doc));
+    });
+    shell.join();
+    // Each tick moves the 2000-sample window a fifth of its width.
+    EXPECT_EQ(begins, (std::vector<int64_t>{400, 800, 1200, 1200}));
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc) - VELMAUDIO_ViewBegin(doc), 2000);
+}
+
+TEST_F(Gestures, SelectionHandleSlides)
+{
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 4000, 8000));
+    draw();
+    ASSERT_EQ(drawer()->overlay.selectionSliderCount, 1);
+    const _VELMRECT handle = drawer()->overlay.selectionSliders[0].end;
+    ASSERT_GT(handle.width, 0);
+    const int x = handle.left + handle.width / 2, y = handle.top + handle.height / 2;
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x, y, 0));
+    ASSERT_EQ(VELMCONTROL_GetMouseOverObject(drawer()), 0x8000A00u);
+    ASSERT_TRUE(VELMAUDIO_MouseDown(doc, x, y, kPrimary));
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x + 60, y, kPrimary));
+    EXPECT_TRUE(VELMCONTROL_IsSlidingSelection(drawer()));
+    EXPECT_EQ(VELMCONTROL_GetSlidingSelectionSample(drawer()), sample_at(x + 60));
+    ASSERT_TRUE(VELMAUDIO_MouseUp(doc, x + 60, y, kPrimary));
+    EXPECT_EQ(VELMAUDIO_SelectionChunkCount(doc), 1);
+    EXPECT_EQ(VELMAUDIO_SelectionBegin(doc), 4000);
+    EXPECT_EQ(VELMAUDIO_SelectionEnd(doc), sample_at(x + 60));
+}
+
 TEST_F(Gestures, KeysChooseTheSmartZoomAction)
 {
     ASSERT_TRUE(VELMAUDIO_AccKeyDown(doc, kExtend));
