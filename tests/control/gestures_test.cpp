@@ -302,6 +302,30 @@ TEST_F(Gestures, SelectionHandleSlides)
     EXPECT_EQ(VELMAUDIO_SelectionEnd(doc), sample_at(x + 60));
 }
 
+TEST_F(Gestures, DraggingASelectionMovesIt)
+{
+    // Draggable selections are read when the drawer is made.
+    soundtest::Setting drag{"libvelm.draw.AudioDragActive", "true"};
+    ASSERT_TRUE(VELMCONTROL_Reset(drawer()));
+    ASSERT_TRUE(VELMAUDIO_SelectAudio(doc, 4000, 6000));
+    draw();
+    const int x = drawer()->display.left + static_cast<int>(VELMDRAW_ConvertRealXtoDisplayX(drawer(), 5000.0));
+    ASSERT_TRUE(VELMAUDIO_AccKeyDown(doc, 0x04));
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x, mid_y(), 0x04));
+    ASSERT_TRUE(VELMCONTROL_GetMouseOverObject(drawer()) & 0x4000000u);
+    ASSERT_TRUE(VELMAUDIO_MouseDown(doc, x, mid_y(), kPrimary | 0x04));
+    // The first movement picks the selection up; it follows from there.
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x + 10, mid_y(), kPrimary | 0x04));
+    EXPECT_TRUE(VELMAUDIO_IsInteracting(doc));
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x + 60, mid_y(), kPrimary | 0x04));
+    const int64_t delta = sample_at(x + 60) - sample_at(x + 10);
+    ASSERT_TRUE(VELMAUDIO_MouseUp(doc, x + 60, mid_y(), kPrimary | 0x04));
+    ASSERT_TRUE(VELMAUDIO_AccKeyUp(doc, 0x04));
+    EXPECT_EQ(VELMAUDIO_SelectionChunkCount(doc), 1);
+    EXPECT_EQ(VELMAUDIO_SelectionBegin(doc), 4000 + delta);
+    EXPECT_EQ(VELMAUDIO_SelectionEnd(doc), 6000 + delta);
+}
+
 TEST_F(Gestures, KeysChooseTheSmartZoomAction)
 {
     ASSERT_TRUE(VELMAUDIO_AccKeyDown(doc, kExtend));
