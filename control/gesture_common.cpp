@@ -111,7 +111,9 @@ void set_channel_mask(VELMDRAW d, uint32_t code)
 
 int lane_of(VELMDRAW d, uint32_t code)
 {
-    const int lane = static_cast<int>(code & 0xFFFu);
+    // The scale codes 0x4200 and 0x4400 reach into the index bits: lanes
+    // are named by the low byte.
+    const int lane = static_cast<int>(code & 0xFFu);
     return lane < std::min(d->laneCount, velm::view::kMaxLanes) ? lane : -1;
 }
 

@@ -42,9 +42,14 @@ int wheel(VELMDRAW d, int x, int y, int delta, uint32_t flags)
     VELMAUDIO doc = d->document;
     if (code & 0x2000000u) wheel_gain(d, n, flags);
     if ((code & 0x4200u) == 0x4200u || ((code & 0x1000u) && (flags & 0x08u))) {
-        const int lane = static_cast<int>(code & 0xFFFu);
-        if (VELMDRAW_ChannelKind(d, lane) == 1) result &= VELMAUDIO_ZoomVerticalFactor(doc, std::pow(1.2, -n)) != 0;
-        else result = 0;
+        const int lane = lane_of(d, code);
+        const double factor = std::pow(1.2, -n);
+        const int kind = VELMDRAW_ChannelKind(d, lane);
+        if (kind == 1) result &= VELMAUDIO_ZoomVerticalFactor(doc, factor) != 0;
+        else if (kind == 2) {
+            const auto centre = static_cast<float>(lane_value(d, lane, d->control.pointerY));
+            result &= VELMAUDIO_ZoomSpectralFactorAround(doc, centre, factor) != 0;
+        } else result = 0;
     }
     if (((code & 0x1000u) || (code & 0x4100u) == 0x4100u) && !(flags & 0x0Eu))
         VELMAUDIO_ZoomByFactor(doc, display_sample(d, d->control.pointerX), n * 0.3);

@@ -168,7 +168,35 @@ TEST_F(Objects, ChannelButtonsChangeThePlayersGains)
     ASSERT_TRUE(VELMAUDIO_MouseDblClick(doc, x, y, kPrimary));
     EXPECT_DOUBLE_EQ(VELMPLAY_GetChannelGain(player, 0), 1.0);
     EXPECT_DOUBLE_EQ(VELMPLAY_GetChannelGain(player, 1), 0.0);
+    // The bottom cursor slider moves the play cursor while playing.
+    // (The playback timer that shows the play cursor ticks in an event loop
+    // this test does not run: it is shown by hand.)
+    drawer()->config.playCursorDrawSlider = 1;
+    VELMAUDIO_SetPlayCursorPosition(doc, 4000);
+    doc->state->playCursor.shown = 1;
+    draw();
+    const _VELMRECT slider = drawer()->overlay.cursorSliders[1];
+    ASSERT_GT(slider.width, 0);
+    const int sx = slider.left + slider.width / 2, sy = slider.top + slider.height / 2;
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, sx, sy, 0));
+    ASSERT_EQ(VELMCONTROL_GetMouseOverObject(drawer()), 0x8000401u);
+    ASSERT_TRUE(VELMAUDIO_MouseDown(doc, sx, sy, kPrimary));
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, sx + 100, sy, kPrimary));
+    EXPECT_TRUE(VELMAUDIO_IsMovingPlayCursor(doc));
+    ASSERT_TRUE(VELMAUDIO_MouseUp(doc, sx + 100, sy, kPrimary));
+    EXPECT_EQ(VELMAUDIO_GetPlayCursorPosition(doc), sample_at(sx + 100));
     ASSERT_TRUE(VELMAUDIO_PlayStop(doc));
+}
+
+TEST_F(Objects, WheelOverTheScaleZoomsVertically)
+{
+    const _VELMRECT &scale = lane(0).vertScale;
+    const double top = doc->state->vertMax;
+    ASSERT_TRUE(VELMAUDIO_MouseWheel(doc, scale.left + scale.width / 2, scale.top + scale.height / 2, 120.0, 0));
+    EXPECT_NEAR(doc->state->vertMax, top / 1.2, 1e-6);
+    // A double click resets it.
+    ASSERT_TRUE(VELMAUDIO_MouseDblClick(doc, scale.left + scale.width / 2, scale.top + scale.height / 2, kPrimary));
+    EXPECT_DOUBLE_EQ(doc->state->vertMax, top);
 }
 
 } // namespace
