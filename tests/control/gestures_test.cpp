@@ -184,6 +184,25 @@ TEST_F(Gestures, NavigatorWindowBordersAndDoubleClick)
     EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 4000);
 }
 
+TEST_F(Gestures, NavigatorWindowDragKeepsItsWidthWithinTheSignal)
+{
+    ASSERT_TRUE(VELMAUDIO_Zoom(doc, 4000, 8000));
+    draw();
+    const _VELMRECT box = drawer()->overlay.navigatorBox;
+    const int x = box.left + box.width / 2, y = box.top + box.height / 2;
+    ASSERT_TRUE(VELMAUDIO_MouseDown(doc, x, y, kPrimary));
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x + 50, y, kPrimary));
+    EXPECT_GT(VELMAUDIO_ViewBegin(doc), 4000);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc) - VELMAUDIO_ViewBegin(doc), 4000);
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x - 2000, y, kPrimary));
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), 0);
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), 4000);
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x + 2000, y, kPrimary));
+    ASSERT_TRUE(VELMAUDIO_MouseUp(doc, x + 2000, y, kPrimary));
+    EXPECT_EQ(VELMAUDIO_ViewEnd(doc), kSamples);
+    EXPECT_EQ(VELMAUDIO_ViewBegin(doc), kSamples - 4000);
+}
+
 TEST_F(Gestures, WheelNotchesAndRemainders)
 {
     const int x = area().left + area().width / 2;
