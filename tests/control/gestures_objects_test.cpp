@@ -200,3 +200,32 @@ TEST_F(Objects, WheelOverTheScaleZoomsVertically)
 }
 
 } // namespace
+
+namespace {
+
+// The view drawn before the document's signal was replaced names regions
+// that are gone: gestures over them must not reach them.
+TEST_F(Objects, GesturesAfterTheSignalWasReplaced)
+{
+    AUDIOREGION *region = VELMAUDIO_CreateRegionEx(doc, "words", 2000, 4000, "one", nullptr, VELMREGION_NO_UNDO);
+    ASSERT_NE(region, nullptr);
+    draw();
+    const _VELMRECT r = region_rect(region);
+    const int x = r.left + r.width / 2, y = r.top + r.height / 2;
+    AUDIOSIGNAL *copy = AUDIOSIGNAL_DuplicateEx(doc->signal, 0);
+    ASSERT_NE(copy, nullptr);
+    AUDIOSIGNAL_Destroy(VELMAUDIO_SetAudioSignal(doc, copy));
+    ASSERT_TRUE(VELMAUDIO_MouseMove(doc, x, y, 0));
+    EXPECT_EQ(VELMCONTROL_GetMouseOverObject(drawer()) & 0x70000u, 0u);
+    click(x, y, kPrimary);
+    ASSERT_TRUE(VELMAUDIO_MouseDblClick(doc, x, y, kPrimary));
+    // Without a signal every gesture is refused.
+    AUDIOSIGNAL *held = VELMAUDIO_SetAudioSignal(doc, nullptr);
+    EXPECT_FALSE(VELMAUDIO_MouseDown(doc, x, y, kPrimary));
+    EXPECT_FALSE(VELMAUDIO_MouseWheel(doc, x, y, 120.0, 0));
+    EXPECT_FALSE(VELMAUDIO_AccKeyDown(doc, kAdd));
+    VELMAUDIO_SetAudioSignal(doc, held);
+    EXPECT_TRUE(VELMAUDIO_AccKeyDown(doc, kAdd));
+}
+
+} // namespace
