@@ -4,6 +4,8 @@
 
 #include <cmath>
 #include <memory>
+#include <utility>
+#include <vector>
 
 #include "control/velmcontrol.h"
 #include "control/velminput.h"
@@ -71,10 +73,21 @@ TEST_F(Objects, RegionClicksSelectAndDragsMove)
     AUDIOREGION *second = VELMAUDIO_CreateRegionEx(doc, "words", 8000, 10000, "two", nullptr, VELMREGION_NO_UNDO);
     ASSERT_TRUE(first && second);
     draw();
+    std::vector<std::pair<uint32_t, void *>> seen;
+    auto record = [](const BLNotifyEvent *e, void *user) {
+        if (e->event == 0x20039 || e->event == 0x2003A)
+            static_cast<std::vector<std::pair<uint32_t, void *>> *>(user)->emplace_back(e->event, e->data1);
+        return 1;
+    };
+    ASSERT_TRUE(VELMAUDIO_AddEventHandler(doc, record, &seen));
     const _VELMRECT a = region_rect(first), b = region_rect(second);
     const int y = a.top + a.height / 2;
     click(a.left + a.width / 2, y, kPrimary);
     EXPECT_TRUE(AUDIOREGION_IsSelected(first));
+    ASSERT_TRUE(VELMAUDIO_MouseDblClick(doc, a.left + a.width / 2, y, kPrimary));
+    using Seen = std::vector<std::pair<uint32_t, void *>>;
+    EXPECT_EQ(seen, (Seen{{0x20039, first}, {0x2003A, first}}));
+    ASSERT_TRUE(VELMAUDIO_DelEventHandler(doc, record, &seen));
     // The add modifier toggles; the region-to-selection one selects its audio.
     click(b.left + b.width / 2, y, kPrimary | kAdd);
     EXPECT_TRUE(AUDIOREGION_IsSelected(first));
