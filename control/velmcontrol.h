@@ -46,6 +46,24 @@ VELM_API int VELMCONTROL_UpdateMouseOverObject(VELMDRAW drawer);
  * drawn, or while another controller call is running. */
 VELM_API int VELMCONTROL_SetPointer(VELMDRAW drawer, int x, int y);
 
+/* The gesture handlers (the shell reaches them through control/velminput.h).
+ * Every one returns 0 for a null drawer, one not yet drawn, a document
+ * without audio, or while another controller call or timer is running.
+ * Move, release and keys return the smart-zoom update (1); a press returns
+ * 0 when its preliminary move fails.  Wheel deltas are in eighths of a
+ * degree; the low 3 bits carry over to the next event.  The hover timer
+ * sends 0x20037 (code, position) or 0x20038 (region, position), the
+ * position being two int32 values x, y. */
+VELM_API int VELMCONTROL_MouseMove(VELMDRAW drawer, int x, int y, uint32_t flags);
+VELM_API int VELMCONTROL_MouseDown(VELMDRAW drawer, int x, int y, uint32_t flags);
+VELM_API int VELMCONTROL_MouseUp(VELMDRAW drawer, int x, int y, uint32_t flags);
+VELM_API int VELMCONTROL_MouseDblClick(VELMDRAW drawer, int x, int y, uint32_t flags);
+VELM_API int VELMCONTROL_MouseWheel(VELMDRAW drawer, int x, int y, int delta, uint32_t flags);
+VELM_API int VELMCONTROL_MouseHWheel(VELMDRAW drawer, int x, int y, int delta, uint32_t flags);
+VELM_API int VELMCONTROL_ZoomGesture(VELMDRAW drawer, int x, int y, double factor);
+VELM_API int VELMCONTROL_AccKeyDown(VELMDRAW drawer, uint32_t bits);
+VELM_API int VELMCONTROL_AccKeyUp(VELMDRAW drawer, uint32_t bits);
+
 /* The quick (zoom) box and the scale-range selections of a document's view
  * state; each is 0 for a null document or one without view state, else 1.
  * Start sets origin and corner to (x, y) with size 0 x 0 and sends 0x2002F
