@@ -10,6 +10,7 @@
 #include "core/velmqueries.h"
 #include "outside/signal/audiosignal.h"
 #include "sound/player_internal.hpp"
+#include "sound/sound_internal.hpp"
 
 namespace velm::play {
 
@@ -37,18 +38,11 @@ int dispose_player(void *object)
     return VELMPLAY_DestroyPlayer(static_cast<VELMPLAYER>(object));
 }
 
-// The device buffer time: at least 5 ms, and no longer than a stream
-// accepts, so that an odd setting still plays instead of failing to open.
-double buffer_time_setting()
-{
-    const double t = BLSETTINGS_GetFloatEx(nullptr, "libvelm.playback.osbuffersize=[%f]", 0.05);
-    return std::isfinite(t) ? std::clamp(t, 0.005, 2.0) : 0.05;
-}
 
 void read_settings(Player *p)
 {
     p->moveCursorOnStop = BLSETTINGS_GetIntEx(nullptr, "libvelm.playback.movecursoronstop=[%d]", 0) != 0;
-    p->deviceBufferTime = buffer_time_setting();
+    p->deviceBufferTime = velmsound::BufferTimeSetting("libvelm.playback.osbuffersize=[%f]");
     p->loopOnSelection = BLSETTINGS_GetIntEx(nullptr, "libvelm.playback.looponaudioselection=[%d]", 0) != 0;
     p->followCursor = BLSETTINGS_GetIntEx(nullptr, "libvelm.playback.followcursor=[%d]", 1) != 0;
 }

@@ -7,21 +7,11 @@
 #include "core/velmqueries.h"
 #include "sound/recorder_guard.hpp"
 #include "sound/recorder_internal.hpp"
+#include "sound/sound_internal.hpp"
 
 namespace {
 
-constexpr double kDefaultBufferTime = 0.05;
 constexpr double kDefaultViewWindow = 30.0;
-// Buffer times outside this range are taken as its nearest end: a device
-// cannot keep up below it, and above it the device's ring grows absurd.
-constexpr double kMinBufferTime = 0.005;
-constexpr double kMaxBufferTime = 2.0;
-
-double buffer_time_setting()
-{
-    const double t = BLSETTINGS_GetFloatEx(nullptr, "libvelm.record.osbuffersize=[%f]", kDefaultBufferTime);
-    return std::isfinite(t) ? std::clamp(t, kMinBufferTime, kMaxBufferTime) : kDefaultBufferTime;
-}
 
 double view_window_setting()
 {
@@ -77,7 +67,7 @@ int VELMRECORD_Initialize(void)
 {
     VELMSOUND_Initialize();
     BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.viewwindowtime=%d", static_cast<int>(kDefaultViewWindow));
-    BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.osbuffersize=%f", kDefaultBufferTime);
+    BLSETTINGS_SetDefaultEx(nullptr, "libvelm.record.osbuffersize=%f", 0.05);
     return 1;
 }
 
@@ -119,7 +109,7 @@ VELMRECORDER VELMRECORD_CreateRecorder(VELMAUDIO doc, uint32_t flags, int64_t po
     r->updateUser = r;
     r->buffer = buffer;
     r->capacity = velm::kRecordBufferSamples;
-    r->bufferTime = static_cast<float>(buffer_time_setting());
+    r->bufferTime = static_cast<float>(velmsound::BufferTimeSetting("libvelm.record.osbuffersize=[%f]"));
     r->viewWindow = static_cast<float>(view_window_setting());
     live_recorders().push_back(r);
     RegisterObject(r, 0, dispose_recorder);

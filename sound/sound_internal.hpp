@@ -67,6 +67,12 @@ void CopyLine(char *buffer, const char *text);
 // channels, a rate the layer can represent.
 bool UsableStreamFormat(const _audio_format *format);
 
+// A device buffer time in seconds read from the setting key ("...=[%f]"):
+// 0.05 when unset or not a number, else kept within 5 ms .. 2 s, so that an
+// odd setting still opens a stream: a device cannot keep up below that, and
+// above it the device's ring grows absurd.
+double BufferTimeSetting(const char *key_format);
+
 } // namespace velmsound
 
 #endif // VELMSOUND_SOUND_INTERNAL_HPP

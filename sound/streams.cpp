@@ -4,6 +4,9 @@
 
 #include "outside/base/blbase.h"
 
+#include <algorithm>
+#include <cmath>
+
 struct _VELMSOUNDSTREAM {
     uint32_t direction; // 0 playback, 1 capture
     VELMSOUNDDEVICE device;
@@ -56,6 +59,12 @@ VELMSOUNDSTREAM Open(VELMSOUNDDEVICE device, uint32_t direction, float buffer_ti
 }
 
 } // namespace
+
+double velmsound::BufferTimeSetting(const char *key_format)
+{
+    const double t = BLSETTINGS_GetFloatEx(nullptr, key_format, 0.05);
+    return std::isfinite(t) ? std::clamp(t, 0.005, 2.0) : 0.05;
+}
 
 VELMSOUNDSTREAM VELMSOUND_OpenPlayback(VELMSOUNDDEVICE device, float buffer_time, VELMSOUND_StreamCallback callback,
                                        void *user, const _audio_format *format)
