@@ -14,6 +14,15 @@ const VELMSOUNDDEVICEINFO *Info(VELMSOUNDDEVICE device)
     return nullptr;
 }
 
+// A 44.1 kHz stereo playback stream of the source, or null when the device
+// does not take that format as it is.
+VELMSOUNDSTREAM OpenStereoPlayback(VELMSOUNDDEVICE device, ToneSource *source)
+{
+    _audio_format format = Format(44100, 2);
+    if (VELMSOUND_SelectPlaybackDevice(device, &format) != device || format.sampleRate != 44100) return nullptr;
+    return VELMSOUND_OpenPlayback(device, 0.05f, &ToneSource::Fill, source, &format);
+}
+
 class AlsaNull : public ::testing::Test {
 protected:
     void SetUp() override
@@ -44,9 +53,7 @@ TEST_F(AlsaNull, IsListedWithItsCapabilities)
 TEST_F(AlsaNull, PlaysAShortSoundThatEndsByItself)
 {
     ToneSource source(Tone(44100, 2, 0.2));
-    _audio_format format = Format(44100, 2);
-    ASSERT_EQ(VELMSOUND_SelectPlaybackDevice(device, &format), device);
-    VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(device, 0.05f, &ToneSource::Fill, &source, &format);
+    VELMSOUNDSTREAM stream = OpenStereoPlayback(device, &source);
     ASSERT_NE(stream, nullptr);
     ASSERT_TRUE(VELMSOUND_Start(stream));
     ASSERT_TRUE(WaitFor([&] { return !VELMSOUND_IsPlaying(stream); }));
@@ -58,9 +65,7 @@ TEST_F(AlsaNull, PlaysAShortSoundThatEndsByItself)
 TEST_F(AlsaNull, PausesAndResumesRightAfterStart)
 {
     ToneSource source(Tone(44100, 2, 0.3));
-    _audio_format format = Format(44100, 2);
-    ASSERT_EQ(VELMSOUND_SelectPlaybackDevice(device, &format), device);
-    VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(device, 0.05f, &ToneSource::Fill, &source, &format);
+    VELMSOUNDSTREAM stream = OpenStereoPlayback(device, &source);
     ASSERT_NE(stream, nullptr);
     ASSERT_TRUE(VELMSOUND_Start(stream));
     ASSERT_TRUE(VELMSOUND_Pause(stream));
@@ -122,9 +127,7 @@ TEST(AlsaFailing, AStreamWhoseWritesFailStillEnds)
     VELMSOUNDDEVICE device = VELMSOUND_GetSoundDeviceByName("file:FILE=/dev/full", 0);
     ASSERT_NE(device, nullptr);
     ToneSource source(Tone(44100, 2, 0.3));
-    _audio_format format = Format(44100, 2);
-    ASSERT_EQ(VELMSOUND_SelectPlaybackDevice(device, &format), device);
-    VELMSOUNDSTREAM stream = VELMSOUND_OpenPlayback(device, 0.05f, &ToneSource::Fill, &source, &format);
+    VELMSOUNDSTREAM stream = OpenStereoPlayback(device, &source);
     ASSERT_NE(stream, nullptr);
     ASSERT_TRUE(VELMSOUND_Start(stream));
     EXPECT_TRUE(WaitFor([&] { return !VELMSOUND_IsPlaying(stream); }));
